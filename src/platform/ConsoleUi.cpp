@@ -1,0 +1,104 @@
+#include "platform/ConsoleUi.h"
+
+#include <algorithm>
+#include <cctype>
+#include <fstream>
+#include <istream>
+#include <ostream>
+
+namespace zv {
+
+namespace {
+
+const char* IconName(Icon icon) {
+  switch (icon) {
+    case Icon::Information:
+      return "information";
+    case Icon::Exclamation:
+      return "exclamation";
+    case Icon::Critical:
+      return "critical";
+    case Icon::Question:
+      return "question";
+    case Icon::None:
+      break;
+  }
+  return "none";
+}
+
+// Each CR LF of a message becomes a line break.
+std::string WithLineBreaks(const std::string& text) {
+  std::string out;
+  out.reserve(text.size());
+  for (size_t i = 0; i < text.size(); ++i) {
+    if (text[i] == '\r' && i + 1 < text.size() && text[i + 1] == '\n') continue;
+    out += text[i];
+  }
+  return out;
+}
+
+std::string Lower(std::string s) {
+  std::transform(s.begin(), s.end(), s.begin(),
+                 [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+  while (!s.empty() && (s.back() == '\r' || s.back() == ' ' || s.back() == '\t')) s.pop_back();
+  size_t first = s.find_first_not_of(" \t");
+  return first == std::string::npos ? std::string() : s.substr(first);
+}
+
+}  // namespace
+
+ConsoleUi::ConsoleUi(std::istream& in, std::ostream& out, std::ostream& err)
+    : in_(in), out_(out), err_(err) {}
+
+Answer ConsoleUi::message(const std::string& text, Icon icon, Buttons buttons,
+                          const std::string& title) {
+  err_ << IconName(icon) << ": " << (title.empty() ? kAppTitle : title) << '\n'
+       << WithLineBreaks(text) << "\n\n";
+  if (buttons == Buttons::Ok) {
+    err_.flush();
+    return Answer::Ok;
+  }
+  const char* prompt = buttons == Buttons::YesNo      ? "[Yes/No]? "
+                       : buttons == Buttons::OkCancel ? "[OK/Cancel]? "
+                                                      : "[Yes/No/Cancel]? ";
+  const Answer safe = buttons == Buttons::YesNo ? Answer::No : Answer::Cancel;
+  for (int attempt = 0; attempt < 3; ++attempt) {
+    err_ << prompt;
+    err_.flush();
+    std::string line;
+    if (!std::getline(in_, line)) return safe;
+    const std::string a = Lower(line);
+    const bool yesNo = buttons == Buttons::YesNo || buttons == Buttons::YesNoCancel;
+    const bool hasCancel = buttons != Buttons::YesNo;
+    if (yesNo && (a == "y" || a == "yes")) return Answer::Yes;
+    if (yesNo && (a == "n" || a == "no")) return Answer::No;
+    if (buttons == Buttons::OkCancel && (a == "o" || a == "ok")) return Answer::Ok;
+    if (hasCancel && (a == "c" || a == "cancel")) return Answer::Cancel;
+  }
+  return safe;
+}
+
+std::optional<std::string> ConsoleUi::input(const std::string& prompt, const std::string& title,
+                                            const std::string& defaultText) {
+  err_ << "input: " << (title.empty() ? kAppTitle : title) << '\n' << WithLineBreaks(prompt);
+  if (!defaultText.empty()) err_ << " [" << defaultText << "]";
+  err_ << "\n> ";
+  err_.flush();
+  std::string line;
+  if (!std::getline(in_, line)) return std::nullopt;
+  if (!line.empty() && line.back() == '\r') line.pop_back();
+  return line;
+}
+
+void ConsoleUi::viewText(const std::string& path, const std::string& typeDescription) {
+  out_ << "view: " << typeDescription << ": " << path << '\n';
+  std::ifstream file(path, std::ios::binary);
+  std::string line;
+  while (std::getline(file, line)) {
+    if (!line.empty() && line.back() == '\r') line.pop_back();
+    out_ << line << '\n';
+  }
+  out_.flush();
+}
+
+}  // namespace zv

@@ -1,0 +1,28 @@
+#pragma once
+// Console implementation of the UI seam for runs without a display.
+// Boxes go to the error stream, answers come from the input stream,
+// viewed files go to the output stream.
+
+#include <iosfwd>
+
+#include "platform/Ui.h"
+
+namespace zv {
+
+class ConsoleUi : public Ui {
+ public:
+  ConsoleUi(std::istream& in, std::ostream& out, std::ostream& err);
+
+  Answer message(const std::string& text, Icon icon, Buttons buttons,
+                 const std::string& title) override;
+  std::optional<std::string> input(const std::string& prompt, const std::string& title,
+                                   const std::string& defaultText) override;
+  void viewText(const std::string& path, const std::string& typeDescription) override;
+
+ private:
+  std::istream& in_;
+  std::ostream& out_;
+  std::ostream& err_;
+};
+
+}  // namespace zv

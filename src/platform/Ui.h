@@ -1,0 +1,48 @@
+#pragma once
+// The UI seam: every message box, question, input box and text viewer of the
+// program goes through this interface (Qt, console and scripted versions).
+
+#include <optional>
+#include <string>
+
+#include "Version.h"
+
+namespace zv {
+
+enum class Icon { None, Information, Exclamation, Critical, Question };
+enum class Buttons { Ok, OkCancel, YesNo, YesNoCancel };
+enum class Answer { Ok, Cancel, Yes, No };
+
+class Ui {
+ public:
+  virtual ~Ui() = default;
+
+  // A modal message box. Texts use CR LF between lines.
+  virtual Answer message(const std::string& text, Icon icon, Buttons buttons,
+                         const std::string& title) = 0;
+  // A text entry box; nullopt when cancelled.
+  virtual std::optional<std::string> input(const std::string& prompt, const std::string& title,
+                                           const std::string& defaultText) = 0;
+  // Shows a text file and returns when the viewer is closed.
+  virtual void viewText(const std::string& path, const std::string& typeDescription) = 0;
+  // Busy pointer on or off.
+  virtual void setBusy(bool) {}
+  // False when the implementation cannot show windows (the console).
+  virtual bool hasWindows() const { return false; }
+
+  // Shorthands for the common boxes.
+  void inform(const std::string& text, const std::string& title = kAppTitle) {
+    message(text, Icon::Information, Buttons::Ok, title);
+  }
+  void exclaim(const std::string& text, const std::string& title = kAppTitle) {
+    message(text, Icon::Exclamation, Buttons::Ok, title);
+  }
+  void critical(const std::string& text, const std::string& title = kAppTitle) {
+    message(text, Icon::Critical, Buttons::Ok, title);
+  }
+  bool askYesNo(const std::string& text, const std::string& title = kAppTitle) {
+    return message(text, Icon::None, Buttons::YesNo, title) == Answer::Yes;
+  }
+};
+
+}  // namespace zv
