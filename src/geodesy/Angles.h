@@ -16,6 +16,8 @@ inline constexpr double kPi = 3.14159265358979;
 inline constexpr double kDegreesToRadians = 0.017453292519943278;
 inline constexpr double kRadiansToDegrees = 57.29577951308238;
 inline constexpr double kFullCircle = 6.28318530717958;
+// The degree sign (character 176) as the program writes it: UTF-8.
+inline constexpr const char* kDegreeSign = "\xC2\xB0";
 
 inline constexpr const char* kFormatDMS = "DDD MM SS.ssss";
 inline constexpr const char* kFormatPacked = "DDD.MMSSssss";
@@ -39,7 +41,9 @@ double Angles_PackedToRadians(Ui& ui, std::string_view text);
 double Angles_DecimalToRadians(std::string_view text);
 double Angles_DMToRadians(Ui& ui, std::string_view text);
 
-// Formatters.
+// Formatters. Seconds (or the minutes of the DM form) that round to 60 at
+// the requested decimals carry into the next field (45 30 00.0000, never
+// 45 29 60.0000), and an angle that rounds to zero prints without "-".
 std::string Angles_RadiansToDecimal(double radians, int decimals, bool withSymbols);
 std::string Angles_RadiansToDM(double radians, int decimals, bool withSymbols);
 std::string Angles_RadiansToDMS(Ui& ui, double radians, int decimals, bool withSymbols);

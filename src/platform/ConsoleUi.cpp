@@ -101,4 +101,21 @@ void ConsoleUi::viewText(const std::string& path, const std::string& typeDescrip
   out_.flush();
 }
 
+bool ConsoleUi::openEditor(const std::string& path, const std::string& typeDescription,
+                           EditorMode mode) {
+  if (mode == EditorMode::Viewer && !path.empty()) {
+    viewText(path, typeDescription);
+    return true;
+  }
+  message("The text editor needs a display." + std::string(path.empty() ? "" : "\r\n" + path),
+          Icon::Exclamation, Buttons::Ok, kAppTitle);
+  return false;
+}
+
+std::optional<std::string> ConsoleUi::chooseFile(const FileDialogSpec& spec) {
+  message("The file dialog \"" + spec.title + "\" needs a display.", Icon::Exclamation, Buttons::Ok,
+          kAppTitle);
+  return std::nullopt;
+}
+
 }  // namespace zv

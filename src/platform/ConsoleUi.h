@@ -18,6 +18,11 @@ class ConsoleUi : public Ui {
   std::optional<std::string> input(const std::string& prompt, const std::string& title,
                                    const std::string& defaultText) override;
   void viewText(const std::string& path, const std::string& typeDescription) override;
+  // A viewer writes the file as viewText does; an editor needs a display.
+  bool openEditor(const std::string& path, const std::string& typeDescription,
+                  EditorMode mode) override;
+  // Reports that a file dialog needs a display; always nullopt.
+  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override;
 
  private:
   std::istream& in_;

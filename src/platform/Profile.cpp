@@ -73,11 +73,8 @@ std::vector<std::string> ReadProfileSections(const std::string& path) {
     auto name = SectionName(line);
     if (!name) continue;
     // Each name and its NUL must fit in the buffer with the closing NUL.
-    if (used + name->size() + 2 > kProfileSectionsLimit) {
-      size_t room = kProfileSectionsLimit > used + 2 ? kProfileSectionsLimit - used - 2 : 0;
-      if (room > 0) names.push_back(name->substr(0, room));
-      break;
-    }
+    // A name cut by the end of the buffer would name no section: drop it.
+    if (used + name->size() + 2 > kProfileSectionsLimit) break;
     used += name->size() + 1;
     names.push_back(*name);
   }

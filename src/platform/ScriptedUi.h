@@ -42,6 +42,20 @@ class ScriptedUi : public Ui {
     viewed.push_back(typeDescription + ": " + path);
   }
 
+  bool openEditor(const std::string& path, const std::string& typeDescription,
+                  EditorMode mode) override {
+    editors.push_back(std::string(mode == EditorMode::Viewer ? "viewer" : "editor") + ": " +
+                      typeDescription + ": " + path);
+    return true;
+  }
+  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override {
+    fileDialogs.push_back(spec);
+    if (files.empty()) return std::nullopt;
+    std::optional<std::string> a = files.front();
+    files.pop_front();
+    return a;
+  }
+
   // The text of the only box shown, or a note that there was not exactly one.
   std::string onlyText() const {
     if (boxes.size() != 1) return "<" + std::to_string(boxes.size()) + " boxes>";
@@ -53,6 +67,9 @@ class ScriptedUi : public Ui {
   std::deque<std::optional<std::string>> inputs;
   std::vector<std::string> inputPrompts;
   std::vector<std::string> viewed;
+  std::vector<std::string> editors;  // "viewer|editor: type: path"
+  std::vector<FileDialogSpec> fileDialogs;
+  std::deque<std::optional<std::string>> files;  // answers to file dialogs
 };
 
 }  // namespace zv

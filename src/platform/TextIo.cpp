@@ -23,7 +23,8 @@ bool LineReader::fill() {
     buf_.erase(0, pos_);
     pos_ = 0;
   }
-  const size_t chunk = 1 << 20;
+  const size_t chunk = chunk_;
+  chunk_ = 1 << 20;  // small inputs get a small buffer, long files 1 MiB chunks
   size_t old = buf_.size();
   buf_.resize(old + chunk);
   in_.read(buf_.data() + old, static_cast<std::streamsize>(chunk));

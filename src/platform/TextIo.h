@@ -27,6 +27,7 @@ class LineReader {
   std::istream& in_;
   std::string buf_;
   size_t pos_ = 0;
+  size_t chunk_ = 64 << 10;
   bool eof_ = false;
 };
 

@@ -12,6 +12,17 @@ namespace zv {
 enum class Icon { None, Information, Exclamation, Critical, Question };
 enum class Buttons { Ok, OkCancel, YesNo, YesNoCancel };
 enum class Answer { Ok, Cancel, Yes, No };
+enum class FileDialogKind { Open, Save };
+enum class EditorMode { Viewer, Editor };
+
+// A common open or save file dialog. The filter is "description|pattern"
+// pairs joined by "|", e.g. "VORN Control Files (*.CTL)|*.CTL".
+struct FileDialogSpec {
+  FileDialogKind kind = FileDialogKind::Open;
+  std::string title;
+  std::string filter;
+  std::string folder;  // initial folder
+};
 
 class Ui {
  public:
@@ -25,6 +36,19 @@ class Ui {
                                            const std::string& defaultText) = 0;
   // Shows a text file and returns when the viewer is closed.
   virtual void viewText(const std::string& path, const std::string& typeDescription) = 0;
+  // A text editor window on the file (a new, empty text when the path is
+  // empty) that stays open on its own; returns at once. False when no window
+  // could be opened.
+  virtual bool openEditor(const std::string& path, const std::string& typeDescription,
+                          EditorMode mode) {
+    (void)path, (void)typeDescription, (void)mode;
+    return false;
+  }
+  // The chosen file's path; nullopt when cancelled or not possible.
+  virtual std::optional<std::string> chooseFile(const FileDialogSpec& spec) {
+    (void)spec;
+    return std::nullopt;
+  }
   // Busy pointer on or off.
   virtual void setBusy(bool) {}
   // False when the implementation cannot show windows (the console).

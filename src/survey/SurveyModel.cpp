@@ -1,5 +1,7 @@
 #include "survey/SurveyModel.h"
 
+#include <algorithm>
+
 namespace zv {
 
 void ResetPoint(SurveyPoint& point) {
@@ -45,6 +47,46 @@ void WorkArea::copyInputToOutput(bool moveInput) {
 void AppendLine(std::string& field, std::string_view line) {
   if (!field.empty()) field += "\r\n";
   field.append(line);
+}
+
+namespace {
+
+struct CodeCategory {
+  std::string_view code;
+  std::string_view category;
+};
+
+// Sorted by code for the binary search below.
+constexpr CodeCategory kCodeCategories[] = {
+    {"AA", "Math"},    {"AR", "Math"},  {"AZ", "Angle"},   {"BP", "Math"},  {"BR", "Bearing"},
+    {"BS", "PointID"}, {"CA", "Angle"}, {"CE", "Seconds"}, {"CF", "Math"},  {"DA", "Angle"},
+    {"DC", "Angle"},   {"DD", "Math"},  {"DH", "Math"},    {"DI", "Math"},  {"DP", "Math"},
+    {"DS", "Math"},    {"DV", "Math"},  {"DX", "Math"},    {"DY", "Math"},  {"DZ", "Math"},
+    {"E1", "Math"},    {"E2", "Math"},  {"ED", "Math"},    {"EF", "Math"},  {"EH", "Seconds"},
+    {"EV", "Seconds"}, {"EX", "Math"},  {"FM", "Math"},    {"HE", "Math"},  {"HG", "Math"},
+    {"HH", "Math"},    {"HO", "Math"},  {"HT", "Math"},    {"HZ", "Math"},  {"IH", "Math"},
+    {"L1", "Math"},    {"L2", "Math"},  {"LC", "Math"},    {"LG", "Angle"}, {"LN", "Math"},
+    {"LO", "Math"},    {"LT", "Angle"}, {"MO", "Math"},    {"NS", "Math"},  {"OD", "Math"},
+    {"OF", "Math"},    {"OO", "Math"},  {"OS", "PointID"}, {"PC", "Math"},  {"PM", "Math"},
+    {"PN", "PointID"}, {"PO", "Math"},  {"R1", "Math"},    {"R2", "Math"},  {"R3", "Math"},
+    {"RA", "Math"},    {"RO", "Math"},  {"RR", "Math"},    {"S1", "Math"},  {"S2", "Math"},
+    {"S3", "Math"},    {"SE", "Math"},  {"SF", "Math"},    {"SH", "Math"},  {"SI", "Math"},
+    {"SS", "Math"},    {"SX", "Math"},  {"SY", "Math"},    {"SZ", "Math"},  {"TE", "Math"},
+    {"TL", "Math"},    {"TN", "Math"},  {"VE", "Seconds"}, {"VO", "Math"},  {"VT", "Math"},
+    {"VV", "Math"},    {"W3", "Math"},  {"WD", "Math"},    {"XC", "Math"},  {"XE", "Math"},
+    {"XX", "Math"},    {"YC", "Math"},  {"YE", "Math"},    {"YY", "Math"},  {"ZC", "Math"},
+    {"ZE", "Math"},    {"ZZ", "Math"},
+};
+
+}  // namespace
+
+std::string RecordCodeCategory(std::string_view code) {
+  if (code.size() < 2) return {};
+  std::string_view key = code.substr(0, 2);
+  auto it = std::lower_bound(std::begin(kCodeCategories), std::end(kCodeCategories), key,
+                             [](const CodeCategory& c, std::string_view k) { return c.code < k; });
+  if (it == std::end(kCodeCategories) || it->code != key) return {};
+  return std::string(it->category);
 }
 
 }  // namespace zv

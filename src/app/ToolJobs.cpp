@@ -1,0 +1,260 @@
+#include "app/ToolJobs.h"
+
+#include <filesystem>
+#include <fstream>
+#include <vector>
+
+#include "app/AppContext.h"
+#include "geodesy/BatchExchange.h"
+#include "platform/Numbers.h"
+#include "platform/Process.h"
+#include "platform/TextIo.h"
+
+namespace zv {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+struct ToolSpec {
+  const char* name;
+  const char* title;
+};
+
+constexpr ToolSpec kConvert{"CONVERT.EXE", "CHANGE"};
+constexpr ToolSpec kPcpt2Pi{"PCPT2PI.EXE", "Converting PCPT Alignment"};
+constexpr ToolSpec kPi2Pcpt{"PI2PCPT.EXE", "Converting PI Alignment"};
+constexpr ToolSpec kExtract{"EXTRACT.EXE", "Extracting Data"};
+constexpr ToolSpec kCtl2Are{"CTL2ARE.EXE", "VORN Coordinates to Geodimeter Area"};
+constexpr ToolSpec kAli2Fla{"ALI2FLA.EXE", "VORN Alignment to Geodimeter Alignment"};
+constexpr ToolSpec kLlev{"LLEV.EXE", "Convert Leica Leveling File"};
+constexpr ToolSpec kSort{"SORT.EXE", "Sort Points and Display Unused Point Numbers"};
+constexpr ToolSpec kLocal{"Local.EXE", "LOCAL"};
+
+std::string ToolPath(const ToolPlace& place, const ToolSpec& tool) {
+  return place.toolFolder + "/" + tool.name;
+}
+
+std::string JobPath(const ToolPlace& place) {
+  return place.jobFolder + "/" + kJobFileName;
+}
+
+// The text without its last four characters (a three-letter extension and
+// its period).
+std::string WithoutExtension(const std::string& path) {
+  return path.size() > 4 ? path.substr(0, path.size() - 4) : std::string();
+}
+
+bool ToolPresent(Ui& ui, const ToolPlace& place, const ToolSpec& tool) {
+  std::error_code ec;
+  if (fs::is_regular_file(ToolPath(place, tool), ec)) return true;
+  ui.exclaim(
+      std::string("The program '") + tool.name + "' was not found in '" + place.toolFolder + "'.",
+      "Program Not Found");
+  return false;
+}
+
+bool CreateEmptyOutput(Ui& ui, const std::string& output) {
+  if (FileExists(output)) return true;
+  std::ofstream file(output, std::ios::binary);
+  if (file) return true;
+  ui.exclaim("The output file '" + output + "' could not be created.");
+  return false;
+}
+
+bool WriteJobFile(Ui& ui, const ToolPlace& place, const std::vector<std::string>& lines) {
+  std::string error;
+  if (WriteTextLines(JobPath(place), lines, &error)) return true;
+  ui.exclaim("The job file '" + JobPath(place) + "' could not be written.\r\n" + error);
+  return false;
+}
+
+// Runs the tool in its job folder, waits, and removes the job file.
+bool RunTool(Ui& ui, const ToolPlace& place, const ToolSpec& tool) {
+  ConsoleWindow window{1, tool.title, place.left, place.top, 640, 125, 240};
+  ProcessResult run = RunAndWait(ToolPath(place, tool), {}, place.jobFolder, window);
+  std::error_code ec;
+  fs::remove(JobPath(place), ec);
+  if (!run.started) {
+    ui.exclaim("The program '" + ToolPath(place, tool) + "' could not be started: " + run.error,
+               "Program Not Started");
+    return false;
+  }
+  return true;
+}
+
+// Tools that read the input and write the output with both paths in the
+// job file.
+bool TwoPathJob(Ui& ui, const ToolSpec& tool, const std::string& input, const std::string& output,
+                const ToolPlace& place) {
+  if (!ToolPresent(ui, place, tool) || !CreateEmptyOutput(ui, output)) return false;
+  if (!WriteJobFile(ui, place, {ShortPath(input), ShortPath(output)})) return false;
+  return RunTool(ui, place, tool);
+}
+
+}  // namespace
+
+ToolPlace PintrelPlace(const std::string& appFolder, int left, int top) {
+  return {appFolder + "/Pintrel", appFolder + "/Pintrel", left, top};
+}
+
+bool ConvertToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const std::string& configuration, const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kConvert) || !CreateEmptyOutput(ui, output)) return false;
+  if (!WriteJobFile(ui, place,
+                    {ShortPath(input), ShortPath(output), WithoutExtension(configuration)})) {
+    return false;
+  }
+  return RunTool(ui, place, kConvert);
+}
+
+bool Pcpt2PiToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place) {
+  return TwoPathJob(ui, kPcpt2Pi, input, output, place);
+}
+
+bool Pi2PcptToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place) {
+  return TwoPathJob(ui, kPi2Pcpt, input, output, place);
+}
+
+bool ExtractToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const std::string& configuration, bool anyMatch, const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kExtract) || !CreateEmptyOutput(ui, output)) return false;
+  if (!WriteJobFile(ui, place,
+                    {ShortPath(input), ShortPath(output), WithoutExtension(configuration),
+                     anyMatch ? "Y" : "N"})) {
+    return false;
+  }
+  return RunTool(ui, place, kExtract);
+}
+
+bool Ctl2AreToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place) {
+  return TwoPathJob(ui, kCtl2Are, input, output, place);
+}
+
+bool Ali2FlaToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place) {
+  return TwoPathJob(ui, kAli2Fla, input, output, place);
+}
+
+bool LlevToolJob(Ui& ui, const std::string& input, const std::string& output, double upperLimit,
+                 const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kLlev)) return false;
+  const std::string shortInput = ShortPath(input);
+  if (!WriteJobFile(ui, place, {shortInput, FormatPlainDecimal(upperLimit)})) return false;
+  if (!RunTool(ui, place, kLlev)) return false;
+
+  // The tool writes its result next to the input, ending in "prj".
+  const std::string result =
+      shortInput.size() >= 3 ? shortInput.substr(0, shortInput.size() - 3) + "prj" : "";
+  std::error_code ec;
+  if (result.empty() || !fs::is_regular_file(result, ec)) {
+    ui.exclaim("LLEV.EXE left no result file '" + result + "'.");
+    return false;
+  }
+  // An output path naming the result itself keeps it.
+  if (fs::equivalent(result, output, ec)) return true;
+  if (!fs::copy_file(result, output, fs::copy_options::overwrite_existing, ec)) {
+    ui.exclaim("The result of LLEV.EXE could not be copied to '" + output + "'.\r\n" +
+               ec.message());
+    return false;
+  }
+  fs::remove(result, ec);
+  return true;
+}
+
+bool SortToolJob(Ui& ui, const std::string& input, const std::string& output,
+                 const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kSort)) return false;
+  if (!WriteJobFile(ui, place, {ShortPath(input), output})) return false;
+  return RunTool(ui, place, kSort);
+}
+
+bool LocalGridToLocalJob(Ui& ui, const std::string& input, const std::string& output, short mode,
+                         const std::string& modeText, const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kLocal) || !CreateEmptyOutput(ui, output)) return false;
+  return WriteJobFile(
+      ui, place,
+      {ShortPath(input), WithoutExtension(ShortPath(output)), std::to_string(mode), modeText});
+}
+
+bool LocalLocalToGridJob(Ui& ui, const std::string& input, const std::string& output,
+                         const std::string& text1, const std::string& text2,
+                         const std::string& text3, const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kLocal) || !CreateEmptyOutput(ui, output)) return false;
+  return WriteJobFile(ui, place,
+                      {ShortPath(input), WithoutExtension(ShortPath(output)), text1, text2, text3});
+}
+
+bool LocalRun(Ui& ui, const ToolPlace& place) {
+  if (!ToolPresent(ui, place, kLocal)) return false;
+  return RunTool(ui, place, kLocal);
+}
+
+// --- Routines of the unattended dispatcher ---
+
+bool ConvertToolRoutine(AppContext& ctx, const RoutineCall& call) {
+  ToolPlace place = PintrelPlace(ctx.appFolder);
+  if (!ConvertToolJob(ctx.ui, call.inputPath, call.outputPath, call.configurationPath, place)) {
+    return false;
+  }
+  const std::string report = place.jobFolder + "/Convert.out";
+  if (FileExists(report)) {
+    ctx.ui.inform("The following codes had no match.");
+    ctx.ui.viewText(report, "Out File (*.OUT)");
+  }
+  return true;
+}
+
+bool Pcpt2PiToolRoutine(AppContext& ctx, const RoutineCall& call) {
+  return Pcpt2PiToolJob(ctx.ui, call.inputPath, call.outputPath, PintrelPlace(ctx.appFolder));
+}
+
+bool Pi2PcptToolRoutine(AppContext& ctx, const RoutineCall& call) {
+  return Pi2PcptToolJob(ctx.ui, call.inputPath, call.outputPath, PintrelPlace(ctx.appFolder));
+}
+
+bool ExtractToolRoutine(AppContext& ctx, const RoutineCall& call) {
+  bool anyMatch = ctx.ui.askYesNo("Is extract by any match?", "Any Match?");
+  return ExtractToolJob(ctx.ui, call.inputPath, call.outputPath, call.configurationPath, anyMatch,
+                        PintrelPlace(ctx.appFolder));
+}
+
+bool LlevToolRoutine(AppContext& ctx, const RoutineCall& call) {
+  std::optional<std::string> answer =
+      ctx.ui.input("Upper limit point number used to exclude points from VORN Project File:",
+                   "Enter Point Number", "");
+  double limit = 0;
+  if (answer && !answer->empty()) {
+    std::optional<double> number = ToNumber(*answer);
+    if (!number) {
+      ctx.ui.exclaim("You must enter a numeric point number.");
+      return false;
+    }
+    limit = *number;
+  }
+  return LlevToolJob(ctx.ui, call.inputPath, call.outputPath, limit, PintrelPlace(ctx.appFolder));
+}
+
+bool SortToolRoutine(AppContext& ctx, const RoutineCall& call) {
+  ToolPlace place = PintrelPlace(ctx.appFolder);
+  if (!SortToolJob(ctx.ui, call.inputPath, call.outputPath, place)) return false;
+  const std::string report = place.jobFolder + "/PTNUM.INF";
+  if (FileExists(report)) {
+    ctx.ui.viewText(report, "Available Point Numbers");
+    std::error_code ec;
+    fs::remove(report, ec);
+  }
+  return true;
+}
+
+bool CoordConvertRoutine(AppContext& ctx, const RoutineCall&) {
+  // The manual mode needs the Coordinate Conversion window, which this
+  // routine does not have.
+  ConversionState state;
+  return BatchExchange(ctx.ui, ctx.appFolder, state, nullptr);
+}
+
+}  // namespace zv

@@ -1,0 +1,74 @@
+#pragma once
+// The external survey tools of the Pintrel folder. None takes arguments:
+// each reads a job file TRANS.JOB in its working folder. A tool job writes
+// that file, runs the tool and waits for it, then removes the file.
+//
+// Every job first checks that the tool is there: a missing tool, or one that
+// cannot be started, is reported by name and the job returns false. Errors
+// creating the empty output file or the job file are reported the same way.
+
+#include <string>
+
+#include "app/Routines.h"
+#include "platform/Ui.h"
+
+namespace zv {
+
+struct AppContext;
+
+// Where a tool runs: its folder, the folder of its job file and the console
+// window position.
+struct ToolPlace {
+  std::string toolFolder;
+  std::string jobFolder;
+  int left = 0;
+  int top = 0;
+};
+
+// Tool and job folder appFolder + "/Pintrel".
+ToolPlace PintrelPlace(const std::string& appFolder, int left = 0, int top = 0);
+
+inline constexpr const char* kJobFileName = "TRANS.JOB";
+
+// The tool jobs; true when the tool ran (whatever it did).
+bool ConvertToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const std::string& configuration, const ToolPlace& place);
+bool Pcpt2PiToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place);
+bool Pi2PcptToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place);
+bool ExtractToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const std::string& configuration, bool anyMatch, const ToolPlace& place);
+bool Ctl2AreToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place);
+bool Ali2FlaToolJob(Ui& ui, const std::string& input, const std::string& output,
+                    const ToolPlace& place);
+// Also copies the tool's result (the input path ending in "prj") to the
+// output path and deletes it; a missing result is reported.
+bool LlevToolJob(Ui& ui, const std::string& input, const std::string& output, double upperLimit,
+                 const ToolPlace& place);
+bool SortToolJob(Ui& ui, const std::string& input, const std::string& output,
+                 const ToolPlace& place);
+
+// "Local.EXE" in two parts: a job writer per direction, then the run.
+bool LocalGridToLocalJob(Ui& ui, const std::string& input, const std::string& output, short mode,
+                         const std::string& modeText, const ToolPlace& place);
+bool LocalLocalToGridJob(Ui& ui, const std::string& input, const std::string& output,
+                         const std::string& text1, const std::string& text2,
+                         const std::string& text3, const ToolPlace& place);
+bool LocalRun(Ui& ui, const ToolPlace& place);
+
+// Routines of the unattended dispatcher (tools in appFolder/Pintrel,
+// window at 0, 0), with their questions and report files.
+bool ConvertToolRoutine(AppContext& ctx, const RoutineCall& call);
+bool Pcpt2PiToolRoutine(AppContext& ctx, const RoutineCall& call);
+bool Pi2PcptToolRoutine(AppContext& ctx, const RoutineCall& call);
+bool ExtractToolRoutine(AppContext& ctx, const RoutineCall& call);
+bool LlevToolRoutine(AppContext& ctx, const RoutineCall& call);
+bool SortToolRoutine(AppContext& ctx, const RoutineCall& call);
+
+// The batch coordinate conversion through tccin.tmp and tccout.tmp of the
+// application folder.
+bool CoordConvertRoutine(AppContext& ctx, const RoutineCall& call);
+
+}  // namespace zv

@@ -1,0 +1,226 @@
+#include "platform/qt/QtUi.h"
+
+#include <QApplication>
+#include <QEventLoop>
+#include <QFileDialog>
+#include <QInputDialog>
+#include <QMessageBox>
+#include <QPointer>
+#include <QRegularExpression>
+#include <QThread>
+#include <type_traits>
+
+#include "editor/TextEditorWindow.h"
+
+namespace zv {
+
+namespace {
+
+// Runs f on the GUI thread and returns its result; a worker thread waits.
+template <typename F>
+auto OnGuiThread(F&& f) -> std::invoke_result_t<F> {
+  using R = std::invoke_result_t<F>;
+  if (QThread::currentThread() == qApp->thread()) return f();
+  if constexpr (std::is_void_v<R>) {
+    QMetaObject::invokeMethod(qApp, f, Qt::BlockingQueuedConnection);
+  } else {
+    R result{};
+    QMetaObject::invokeMethod(
+        qApp, [&] { result = f(); }, Qt::BlockingQueuedConnection);
+    return result;
+  }
+}
+
+QWidget* Owner() {
+  if (QWidget* modal = QApplication::activeModalWidget()) return modal;
+  return QApplication::activeWindow();
+}
+
+QString Title(const std::string& title) {
+  return QString::fromStdString(title.empty() ? std::string(kAppTitle) : title);
+}
+
+QString Text(const std::string& text) {
+  QString s = QString::fromStdString(text);
+  s.replace("\r\n", "\n");
+  return s;
+}
+
+// The normal pointer while a window waits for an answer.
+class PointerPause {
+ public:
+  explicit PointerPause(bool busy) : busy_(busy) {
+    if (busy_) QApplication::restoreOverrideCursor();
+  }
+  ~PointerPause() {
+    if (busy_) QApplication::setOverrideCursor(Qt::WaitCursor);
+  }
+
+ private:
+  bool busy_;
+};
+
+TextEditorWindow* NewEditor(Ui& ui, const std::string& path, const std::string& type,
+                            EditorMode mode) {
+  auto* editor = new TextEditorWindow(ui);
+  editor->setAttribute(Qt::WA_DeleteOnClose);
+  // Shown first: a long file then fills a visible window behind its progress.
+  editor->show();
+  if (path.empty() && mode == EditorMode::Editor) {
+    editor->showNew(QString::fromStdString(type));
+  } else {
+    editor->showTextEditor(QString::fromStdString(path), QString::fromStdString(type),
+                           mode == EditorMode::Viewer);
+  }
+  return editor;
+}
+
+}  // namespace
+
+QStringList QtNameFilters(const std::string& filter) {
+  const QStringList parts = QString::fromStdString(filter).split('|');
+  static const QRegularExpression kTrailingGroup(R"(\s*\([^()]*\)\s*$)");
+  QStringList filters;
+  for (qsizetype i = 0; i + 1 < parts.size(); i += 2) {
+    QString description = parts[i];
+    description.remove(kTrailingGroup);
+    QStringList patterns;
+    for (const QString& p : parts[i + 1].split(';', Qt::SkipEmptyParts)) {
+      const QString pattern = p.trimmed();
+      if (pattern == "*.*" || pattern == "*") {
+        patterns << "*";
+        continue;
+      }
+      for (const QString& variant : {pattern, pattern.toUpper(), pattern.toLower()})
+        if (!patterns.contains(variant)) patterns << variant;
+    }
+    if (patterns.isEmpty()) patterns << "*";
+    filters << description + " (" + patterns.join(' ') + ")";
+  }
+  return filters;
+}
+
+Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
+                     const std::string& title) {
+  return OnGuiThread([&] {
+    QMessageBox box(Owner());
+    box.setWindowTitle(Title(title));
+    box.setTextFormat(Qt::PlainText);
+    box.setText(Text(text));
+    switch (icon) {
+      case Icon::Information:
+        box.setIcon(QMessageBox::Information);
+        break;
+      case Icon::Exclamation:
+        box.setIcon(QMessageBox::Warning);
+        break;
+      case Icon::Critical:
+        box.setIcon(QMessageBox::Critical);
+        break;
+      case Icon::Question:
+        box.setIcon(QMessageBox::Question);
+        break;
+      case Icon::None:
+        box.setIcon(QMessageBox::NoIcon);
+        break;
+    }
+    switch (buttons) {
+      case Buttons::Ok:
+        box.setStandardButtons(QMessageBox::Ok);
+        break;
+      case Buttons::OkCancel:
+        box.setStandardButtons(QMessageBox::Ok | QMessageBox::Cancel);
+        box.setEscapeButton(QMessageBox::Cancel);
+        break;
+      case Buttons::YesNo:
+        box.setStandardButtons(QMessageBox::Yes | QMessageBox::No);
+        box.setDefaultButton(QMessageBox::Yes);
+        box.setEscapeButton(QMessageBox::No);
+        break;
+      case Buttons::YesNoCancel:
+        box.setStandardButtons(QMessageBox::Yes | QMessageBox::No | QMessageBox::Cancel);
+        box.setDefaultButton(QMessageBox::Yes);
+        box.setEscapeButton(QMessageBox::Cancel);
+        break;
+    }
+    PointerPause pause(busy_);
+    switch (box.exec()) {
+      case QMessageBox::Yes:
+        return Answer::Yes;
+      case QMessageBox::No:
+        return Answer::No;
+      case QMessageBox::Ok:
+        return Answer::Ok;
+      default:
+        // A box closed without a button gives the safe answer.
+        return buttons == Buttons::YesNo ? Answer::No
+               : buttons == Buttons::Ok  ? Answer::Ok
+                                         : Answer::Cancel;
+    }
+  });
+}
+
+std::optional<std::string> QtUi::input(const std::string& prompt, const std::string& title,
+                                       const std::string& defaultText) {
+  return OnGuiThread([&]() -> std::optional<std::string> {
+    PointerPause pause(busy_);
+    bool ok = false;
+    QString answer = QInputDialog::getText(Owner(), Title(title), Text(prompt), QLineEdit::Normal,
+                                           QString::fromStdString(defaultText), &ok);
+    if (!ok) return std::nullopt;
+    return answer.toStdString();
+  });
+}
+
+void QtUi::viewText(const std::string& path, const std::string& typeDescription) {
+  OnGuiThread([&] {
+    PointerPause pause(busy_);
+    QPointer<TextEditorWindow> viewer = NewEditor(*this, path, typeDescription, EditorMode::Viewer);
+    // Wait for the viewer to close while every window keeps working.
+    QEventLoop loop;
+    QObject::connect(viewer, &QObject::destroyed, &loop, &QEventLoop::quit);
+    if (viewer) loop.exec();
+  });
+}
+
+bool QtUi::openEditor(const std::string& path, const std::string& typeDescription,
+                      EditorMode mode) {
+  return OnGuiThread([&] {
+    NewEditor(*this, path, typeDescription, mode);
+    return true;
+  });
+}
+
+std::optional<std::string> QtUi::chooseFile(const FileDialogSpec& spec) {
+  return OnGuiThread([&]() -> std::optional<std::string> {
+    PointerPause pause(busy_);
+    QFileDialog dialog(Owner(), QString::fromStdString(spec.title),
+                       QString::fromStdString(spec.folder));
+    dialog.setNameFilters(QtNameFilters(spec.filter));
+    if (spec.kind == FileDialogKind::Open) {
+      dialog.setAcceptMode(QFileDialog::AcceptOpen);
+      dialog.setFileMode(QFileDialog::ExistingFile);
+    } else {
+      dialog.setAcceptMode(QFileDialog::AcceptSave);
+      dialog.setFileMode(QFileDialog::AnyFile);
+    }
+    if (dialog.exec() != QDialog::Accepted || dialog.selectedFiles().isEmpty()) {
+      return std::nullopt;
+    }
+    return dialog.selectedFiles().front().toStdString();
+  });
+}
+
+void QtUi::setBusy(bool on) {
+  OnGuiThread([&] {
+    if (on == busy_) return;
+    busy_ = on;
+    if (on) {
+      QApplication::setOverrideCursor(Qt::WaitCursor);
+    } else {
+      QApplication::restoreOverrideCursor();
+    }
+  });
+}
+
+}  // namespace zv

@@ -1,0 +1,34 @@
+#pragma once
+// Qt implementation of the UI seam: message boxes, the input box, file
+// dialogs, the busy pointer and text editor windows. It may be called from a
+// worker thread: every window is then shown by the GUI thread while the
+// worker waits.
+
+#include <QStringList>
+
+#include "platform/Ui.h"
+
+namespace zv {
+
+class QtUi : public Ui {
+ public:
+  Answer message(const std::string& text, Icon icon, Buttons buttons,
+                 const std::string& title) override;
+  std::optional<std::string> input(const std::string& prompt, const std::string& title,
+                                   const std::string& defaultText) override;
+  void viewText(const std::string& path, const std::string& typeDescription) override;
+  bool openEditor(const std::string& path, const std::string& typeDescription,
+                  EditorMode mode) override;
+  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override;
+  void setBusy(bool on) override;
+  bool hasWindows() const override { return true; }
+
+ private:
+  bool busy_ = false;  // GUI thread only
+};
+
+// The name filters of a "description|pattern|..." filter: patterns match
+// without regard to letter case; "*.*" and a missing pattern match every file.
+QStringList QtNameFilters(const std::string& filter);
+
+}  // namespace zv

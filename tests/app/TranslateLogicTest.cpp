@@ -1,0 +1,399 @@
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <sstream>
+
+#include "app/AppContext.h"
+#include "app/TranslateLogic.h"
+#include "platform/ConsoleUi.h"
+#include "platform/Error.h"
+#include "platform/ScriptedUi.h"
+#include "support/TempDir.h"
+
+namespace zv {
+namespace {
+
+using test::CrLf;
+using test::ReadFile;
+
+const std::string kCtl = "VORN Control Files (*.CTL)";
+const std::string kPac = "VORN Points and Chains Files (*.PAC)";
+const std::string kPrj = "VORN Project Files (*.PRJ)";
+
+const std::string kControl =
+    CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0", "ZC:300.5", "FE:TREE", "AC:OS",
+          "PN:CP2", "YC:1100.25", "XC:2050.75", "ZC:301.0", "FE:POLE"});
+
+class TranslateLogicTest : public ::testing::Test {
+ protected:
+  TranslateLogicTest() : ctx(ui, dir.path()), logic(ctx) {
+    // Loaded in file-name order.
+    def("A1", {"ConvertFile", "To PAC", kCtl, kPac});
+    def("A2", {"ConvertFile", "To PRJ", kCtl, kPrj});
+    def("A3", {"Replace", "Filter", kCtl, kCtl, "CODES.TRN"});
+    def("A4", {"ConvertFile", "Copy", kCtl, kCtl});
+    def("B1", {"ConvertFile", "To CTL", kPac, kCtl});
+    def("B2", {"CoordConvert", "Batch", kPac, kCtl});
+    def("B3", {"Replace", "Bare filter", kPac, kPac});
+    def("C1", {"SinglePoint", "One point", kManualEntryType, kManualEntryType});
+    dir.write("TRNFiles/CODES.TRN", CrLf({"FE:TREE FE:OAK"}));
+    input = dir.write("data/job.ctl", kControl);
+    ctx.startup.defaultInputFolder = dir.file("data/");
+    ctx.startup.defaultOutputFolder = dir.file("out/");
+    ctx.startup.configurationFolder = dir.file("TRNFiles");
+    std::filesystem::create_directories(dir.file("out"));
+  }
+  void def(const std::string& name, const std::vector<std::string>& lines) {
+    dir.write("UTIFiles/" + name + ".uti", CrLf(lines));
+  }
+  // Selects the three entries by name.
+  void choose(const std::string& in, const std::string& out, const std::string& action) {
+    logic.selectInputType(logic.inputTypes.find(in));
+    logic.selectOutputType(logic.outputTypes.find(out));
+    logic.selectAction(logic.actions.find(action));
+  }
+  std::vector<std::string> texts() const {
+    std::vector<std::string> t;
+    for (const auto& b : ui.boxes) t.push_back(b.text);
+    return t;
+  }
+
+  test::TempDir dir;
+  ScriptedUi ui;
+  AppContext ctx;
+  TranslateLogic logic;
+  std::string input;
+};
+
+TEST(ChoiceListTest, FillDropsEmptyAndRepeatedEntriesKeepingFirstPositions) {
+  ChoiceList list;
+  list.fill("B||A|B|C||A|");
+  EXPECT_EQ(list.items, (std::vector<std::string>{"B", "A", "C"}));
+  EXPECT_EQ(list.selected, -1);
+  list.fill("");
+  EXPECT_TRUE(list.items.empty());
+}
+
+TEST_F(TranslateLogicTest, ListsCascadeFromTheCatalogue) {
+  ASSERT_TRUE(logic.load());
+  EXPECT_TRUE(ui.boxes.empty());
+  EXPECT_EQ(logic.inputTypes.items, (std::vector<std::string>{kCtl, kPac, kManualEntryType}));
+  // Filling a list selects its first entry, which fills the list below.
+  EXPECT_EQ(logic.inputTypes.current(), kCtl);
+  EXPECT_EQ(logic.outputTypes.items, (std::vector<std::string>{kPac, kPrj, kCtl}));
+  EXPECT_EQ(logic.outputTypes.current(), kPac);
+  EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"To PAC"}));
+  EXPECT_TRUE(logic.input.enabled);
+  EXPECT_TRUE(logic.output.enabled);
+  EXPECT_FALSE(logic.configuration.enabled);
+
+  logic.selectOutputType(logic.outputTypes.find(kCtl));
+  EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"Filter", "Copy"}));
+  EXPECT_EQ(logic.actions.current(), "Filter");
+  // A bare configuration name is found in TRNFiles.
+  EXPECT_TRUE(logic.configuration.enabled);
+  EXPECT_EQ(logic.configuration.text, dir.file("TRNFiles/CODES.TRN"));
+  EXPECT_TRUE(logic.storeDefault);
+
+  logic.selectAction(logic.actions.find("Copy"));
+  EXPECT_FALSE(logic.configuration.enabled);
+  EXPECT_EQ(logic.configuration.text, "");
+  EXPECT_FALSE(logic.storeDefault);
+
+  // Another input type starts the cascade again and resets the configuration.
+  logic.selectAction(logic.actions.find("Filter"));
+  logic.selectInputType(logic.inputTypes.find(kPac));
+  EXPECT_EQ(logic.outputTypes.items, (std::vector<std::string>{kCtl, kPac}));
+  EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"To CTL", "Batch"}));
+  EXPECT_FALSE(logic.configuration.enabled);
+  EXPECT_FALSE(logic.storeDefault);
+}
+
+TEST_F(TranslateLogicTest, ManualEntryHasNoLocationAndSkipsTheFileChecks) {
+  ASSERT_TRUE(logic.load());
+  logic.selectInputType(logic.inputTypes.find(kManualEntryType));
+  EXPECT_FALSE(logic.input.enabled);
+  EXPECT_EQ(logic.input.text, "");
+  EXPECT_FALSE(logic.output.enabled);
+  EXPECT_EQ(logic.output.text, "");
+  // No input path is asked for; the routine is not one the window runs yet.
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.onlyText(), "Could not perform translation.");
+}
+
+TEST_F(TranslateLogicTest, PresetsProposeFolderStemAndExtension) {
+  ctx.startup.fileStem = "job";
+  // Letter case counts on this system: job.ctl is not job.CTL.
+  ASSERT_TRUE(logic.load());
+  EXPECT_EQ(logic.input.text, dir.file("data/"));
+  dir.write("data/job.CTL", kControl);
+  logic.selectInputType(0);
+  EXPECT_EQ(logic.input.text, dir.file("data/job.CTL"));
+  // No out/job.PAC: the folder alone.
+  EXPECT_EQ(logic.output.text, dir.file("out/"));
+  dir.write("out/job.CTL", "x");
+  logic.selectOutputType(logic.outputTypes.find(kCtl));
+  EXPECT_EQ(logic.output.text, dir.file("out/job.CTL"));
+}
+
+TEST_F(TranslateLogicTest, ChecksComeInOrderEachWithItsMessage) {
+  ASSERT_TRUE(logic.load());
+  choose(kCtl, kCtl, "Filter");
+  const std::string output = dir.file("out/job.CTL");
+  struct Step {
+    std::function<void()> change;
+    std::string message;
+  };
+  std::vector<Step> steps = {
+      {[&] { logic.inputTypes.selected = -1; }, "You must select an input type"},
+      {[&] {
+         logic.inputTypes.selected = 0;
+         logic.input.text = "";
+       },
+       "You must enter an input file location and name."},
+      {[&] { logic.input.text = dir.file("data/"); }, "The specified input file does not exist."},
+      {[&] {
+         logic.input.text = input;
+         logic.outputTypes.selected = -1;
+       },
+       "You must select an output type"},
+      {[&] {
+         logic.outputTypes.selected = logic.outputTypes.find(kCtl);
+         logic.output.text = "";
+       },
+       "You must enter an output file location and name."},
+      {[&] { logic.output.text = dir.file("DATA/JOB.ctl"); },
+       "The input and output files can not be the same."},
+      {[&] {
+         logic.output.text = output;
+         logic.actions.selected = -1;
+       },
+       "You must select an action type"},
+      {[&] {
+         logic.actions.selected = logic.actions.find("Filter");
+         logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
+       },
+       "The specified translation/filter file does not exist."},
+  };
+  for (const Step& step : steps) {
+    ui.boxes.clear();
+    step.change();
+    EXPECT_FALSE(logic.translate());
+    ASSERT_EQ(ui.boxes.size(), 1u) << step.message;
+    EXPECT_EQ(ui.boxes[0].text, step.message);
+    EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
+    EXPECT_EQ(ui.boxes[0].title, step.message.starts_with("The input and output")
+                                     ? "Incompatible Files"
+                                     : "VORN Zurevazidu");
+  }
+  EXPECT_FALSE(std::filesystem::exists(output));
+}
+
+// Two spellings of one file must not let the output replace the input.
+TEST_F(TranslateLogicTest, RefusesTwoNamesOfTheSameFile) {
+  ASSERT_TRUE(logic.load());
+  choose(kCtl, kCtl, "Copy");
+  logic.input.text = input;
+  logic.output.text = dir.file("data/../data/./job.ctl");
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.onlyText(), "The input and output files can not be the same.");
+  std::filesystem::create_symlink(input, dir.file("out/link.ctl"));
+  logic.output.text = dir.file("out/link.ctl");
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ReadFile(input), kControl);
+}
+
+TEST_F(TranslateLogicTest, ConvertFileRunsAndReportsCompletion) {
+  ASSERT_TRUE(logic.load());
+  choose(kCtl, kPac, "To PAC");
+  logic.input.text = input;
+  logic.output.text = dir.file("out/job.pac");
+  ctx.work.ConversionOptionsActive = true;
+  int longRuns = 0;
+  logic.setLongRunner([&](const std::function<bool()>& work) {
+    ++longRuns;
+    return work();
+  });
+  ASSERT_TRUE(logic.translate()) << ui.onlyText();
+  EXPECT_EQ(longRuns, 1);
+  EXPECT_FALSE(ctx.work.ConversionOptionsActive);
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].text, "Conversion Complete.");
+  EXPECT_EQ(ui.boxes[0].title, "Conversion Complete");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_NE(ReadFile(dir.file("out/job.pac")).find("PN:CP2\r\n"), std::string::npos);
+  EXPECT_TRUE(ui.editors.empty());
+
+  // With the view flag the output opens in a viewer; a second OK overwrites
+  // without a question.
+  ctx.startup.viewOutput = true;
+  ASSERT_TRUE(logic.translate());
+  EXPECT_EQ(ui.boxes.size(), 2u);
+  EXPECT_EQ(ui.editors,
+            (std::vector<std::string>{"viewer: " + kPac + ": " + dir.file("out/job.pac")}));
+}
+
+TEST_F(TranslateLogicTest, RunFailuresNameTheirCause) {
+  ASSERT_TRUE(logic.load());
+  choose(kCtl, kPrj, "To PRJ");
+  logic.input.text = input;
+  logic.output.text = dir.file("out/job.prj");
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.onlyText(), "Can not convert to " + kPrj);
+  EXPECT_EQ(ui.boxes[0].title, "Invalid Format");
+  EXPECT_FALSE(std::filesystem::exists(dir.file("out/job.prj")));
+
+  ui.boxes.clear();
+  choose(kPac, kCtl, "Batch");
+  logic.input.text = input;
+  logic.output.text = dir.file("out/job.CTL");
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.onlyText(), "Could not perform translation.");
+}
+
+TEST_F(TranslateLogicTest, ErrorsRaisedDuringARunAreShownWithTheirSource) {
+  ASSERT_TRUE(logic.load());
+  logic.input.text = input;
+  logic.output.text = dir.file("out/job.pac");
+  logic.setLongRunner([](const std::function<bool()>&) -> bool {
+    throw ZvError(13, "Type mismatch", "modAngles.Angles_PackedToRadians");
+  });
+  EXPECT_FALSE(logic.translate());
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].text, "Type mismatch");
+  EXPECT_EQ(ui.boxes[0].title, "modAngles.Angles_PackedToRadians");
+}
+
+TEST_F(TranslateLogicTest, ReplaceChecksItsConfigurationAndStoresTheDefault) {
+  ASSERT_TRUE(logic.load());
+  // A "Replace" definition without a default configuration file.
+  const std::string pac = dir.write("data/job.pac", CrLf({"AC:PD", "PN:CP1"}));
+  choose(kPac, kPac, "Bare filter");
+  EXPECT_FALSE(logic.configuration.enabled);
+  logic.input.text = pac;
+  logic.output.text = dir.file("out/job.pac");
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.onlyText(), "You must specify a configuration file to use for this translation.");
+  logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
+  ui.boxes.clear();
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.onlyText(), "The specified configuration file does not exist.");
+
+  ui.boxes.clear();
+  choose(kCtl, kCtl, "Filter");
+  logic.input.text = input;
+  logic.output.text = dir.file("out/job.CTL");
+
+  // A browsed file clears the "default" box: the definition keeps its default.
+  const std::string other = dir.write("elsewhere/OTHER.TRN", CrLf({"FE:POLE FE:MAST"}));
+  ui.files.push_back(other);
+  logic.browseConfiguration();
+  EXPECT_EQ(logic.configuration.text, other);
+  EXPECT_FALSE(logic.storeDefault);
+  ui.boxes.clear();
+  ASSERT_TRUE(logic.translate()) << ui.onlyText();
+  EXPECT_EQ(ui.onlyText(), "Translation Complete.");
+  EXPECT_NE(ReadFile(dir.file("out/job.CTL")).find("FE:MAST\r\n"), std::string::npos);
+  EXPECT_EQ(ReadFile(dir.file("UTIFiles/A3.uti")),
+            CrLf({"Replace", "Filter", kCtl, kCtl, "CODES.TRN"}));
+
+  // Ticked again, the file becomes the definition's default.
+  logic.storeDefault = true;
+  ASSERT_TRUE(logic.translate());
+  EXPECT_EQ(ReadFile(dir.file("UTIFiles/A3.uti")), CrLf({"Replace", "Filter", kCtl, kCtl, other}));
+}
+
+TEST_F(TranslateLogicTest, CancelRecordsTheDefinitionTheNextStartOpensOn) {
+  ASSERT_TRUE(logic.load());
+  choose(kCtl, kCtl, "Copy");
+  logic.input.text = input;
+  logic.output.text = dir.file("out/copy.ctl");
+  ASSERT_TRUE(logic.translate());
+  logic.cancel();
+  EXPECT_EQ(ReadFile(dir.file("Quorvane.cfg")), CrLf({dir.file("UTIFiles/A4.uti")}));
+
+  AppContext next(ui, dir.path());
+  TranslateLogic again(next);
+  ASSERT_TRUE(again.load());
+  EXPECT_EQ(again.inputTypes.current(), kCtl);
+  EXPECT_EQ(again.outputTypes.current(), kCtl);
+  EXPECT_EQ(again.actions.current(), "Copy");
+
+  // A definition that is gone: the window opens on the first entries.
+  std::filesystem::remove(dir.file("UTIFiles/A4.uti"));
+  AppContext third(ui, dir.path());
+  TranslateLogic gone(third);
+  ASSERT_TRUE(gone.load());
+  EXPECT_EQ(gone.outputTypes.current(), kPac);
+}
+
+TEST_F(TranslateLogicTest, BrowseButtonsAskWithTheTypeFilters) {
+  def("D1", {"ConvertFile", "Flex", "User-Defined ASCII Files (*.*)", kCtl});
+  ASSERT_TRUE(logic.load());
+  ui.files = {dir.file("data/picked.ctl"), std::nullopt};
+  logic.browseInput();
+  EXPECT_EQ(logic.input.text, dir.file("data/picked.ctl"));
+  logic.browseOutput();  // cancelled: nothing changes
+  EXPECT_EQ(logic.output.text, dir.file("out/"));
+  logic.selectInputType(logic.inputTypes.find("User-Defined ASCII Files (*.*)"));
+  logic.browseInput();
+  ASSERT_EQ(ui.fileDialogs.size(), 3u);
+  EXPECT_EQ(ui.fileDialogs[0].title, "Select the Input File:");
+  EXPECT_EQ(ui.fileDialogs[0].filter, kCtl + "|*.CTL");
+  EXPECT_EQ(ui.fileDialogs[0].folder, dir.file("data/"));
+  EXPECT_EQ(ui.fileDialogs[1].title, "Output to File:");
+  EXPECT_EQ(ui.fileDialogs[1].kind, FileDialogKind::Save);
+  EXPECT_EQ(ui.fileDialogs[1].filter, kPac + "|*.PAC");
+  EXPECT_EQ(ui.fileDialogs[2].filter, "User-Defined ASCII Files (*.*)|*.*");
+}
+
+TEST_F(TranslateLogicTest, ConfigurationFilesOpenInTheEditor) {
+  ASSERT_TRUE(logic.load());
+  logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
+  logic.editConfiguration();
+  EXPECT_EQ(ui.onlyText(), "The file '" + dir.file("TRNFiles/NONE.TRN") + "' does not exist.");
+  logic.configuration.text = dir.file("TRNFiles/CODES.TRN");
+  logic.editConfiguration();
+  logic.newConfiguration();
+  EXPECT_EQ(ui.editors, (std::vector<std::string>{"editor: Translation/Filter File (*.TRN): " +
+                                                      dir.file("TRNFiles/CODES.TRN"),
+                                                  "editor: Translation/Filter Files (*.TRN): "}));
+}
+
+// Without a display the dialogs say what they need and change nothing.
+TEST_F(TranslateLogicTest, ConsoleCannotBrowseOrEditButCanView) {
+  std::istringstream in;
+  std::ostringstream out, err;
+  ConsoleUi console(in, out, err);
+  AppContext consoleCtx(console, dir.path());
+  consoleCtx.startup = ctx.startup;
+  TranslateLogic consoleLogic(consoleCtx);
+  ASSERT_TRUE(consoleLogic.load());
+  const std::string before = consoleLogic.input.text;
+  consoleLogic.browseInput();
+  EXPECT_EQ(consoleLogic.input.text, before);
+  consoleLogic.newConfiguration();
+  EXPECT_EQ(err.str(),
+            "exclamation: VORN Zurevazidu\n"
+            "The file dialog \"Select the Input File:\" needs a display.\n\n"
+            "exclamation: VORN Zurevazidu\nThe text editor needs a display.\n\n");
+  EXPECT_TRUE(console.openEditor(input, kCtl, EditorMode::Viewer));
+  EXPECT_EQ(out.str().substr(0, out.str().find('\n')), "view: " + kCtl + ": " + input);
+}
+
+TEST_F(TranslateLogicTest, NoDefinitionsLeaveTheListsEmpty) {
+  std::filesystem::remove_all(dir.file("UTIFiles"));
+  EXPECT_FALSE(logic.load());
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].text, "No valid translations were found!");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Critical);
+  EXPECT_TRUE(logic.inputTypes.items.empty());
+  EXPECT_FALSE(logic.translate());
+  EXPECT_EQ(ui.boxes.back().text, "You must select an input type");
+  EXPECT_EQ(TranslateLogic::Caption(), "VORN Zurevazidu - " + std::to_string(kVersionMajor) + "." +
+                                           std::to_string(kVersionMinor) + "." +
+                                           std::to_string(kVersionRevision));
+}
+
+}  // namespace
+}  // namespace zv

@@ -1,0 +1,264 @@
+#include <gtest/gtest.h>
+
+#include <QAction>
+#include <QCheckBox>
+#include <QLabel>
+#include <QLineEdit>
+#include <QMenu>
+#include <QMenuBar>
+#include <QPlainTextEdit>
+#include <QPrinter>
+#include <QPushButton>
+#include <QTest>
+#include <filesystem>
+
+#include "editor/FindReplaceDialog.h"
+#include "editor/TextEditorWindow.h"
+#include "platform/ScriptedUi.h"
+#include "support/TempDir.h"
+
+namespace zv {
+namespace {
+
+using test::CrLf;
+using test::ReadFile;
+
+class EditorTest : public ::testing::Test {
+ protected:
+  EditorTest() : editor(ui) {}
+
+  QAction* action(const char* name) { return editor.findChild<QAction*>(name); }
+  QString status(const char* panel) { return editor.findChild<QLabel*>(panel)->text(); }
+  QPlainTextEdit* text() { return editor.findChild<QPlainTextEdit*>("rtbTextEditor"); }
+  FindReplaceDialog* find(const QString& what, const QString& with = {}) {
+    FindReplaceDialog* d = editor.findDialog();
+    d->findChild<QLineEdit*>("txtFRFind")->setText(what);
+    d->findChild<QLineEdit*>("txtFRReplace")->setText(with);
+    return d;
+  }
+  void typeAtEnd(const QString& s) {
+    QTextCursor c = text()->textCursor();
+    c.movePosition(QTextCursor::End);
+    c.insertText(s);
+  }
+  void caretAt(int position) {
+    QTextCursor c = text()->textCursor();
+    c.setPosition(position);
+    text()->setTextCursor(c);
+  }
+
+  test::TempDir dir;
+  ScriptedUi ui;
+  TextEditorWindow editor;
+};
+
+TEST_F(EditorTest, ViewerHidesTheEditingMenusAndShowsViewsForTaggedFiles) {
+  const std::string path = dir.write("job.CTL", CrLf({"AC:PR", "AC:OS", "PN:1"}));
+  editor.showTextEditor(QString::fromStdString(path), "VORN Control Files (*.CTL)", true);
+  EXPECT_TRUE(text()->isReadOnly());
+  EXPECT_EQ(text()->toPlainText(), "AC:PR\nAC:OS\nPN:1\n");
+  EXPECT_FALSE(editor.changed());
+  EXPECT_EQ(editor.windowTitle(), "VORN File Viewer - " + QString::fromStdString(path));
+  for (const char* hidden :
+       {"mnuEditReplace", "mnuEditCut", "mnuEditPaste", "mnuEditClear", "mnuFileNew", "mnuFileOpen",
+        "mnuFileClose", "mnuFileSave", "mnuFileSep1"})
+    EXPECT_FALSE(action(hidden)->isVisible()) << hidden;
+  for (const char* shown : {"mnuFileSaveAs", "mnuFilePrint", "mnuEditCopy", "mnuEditFind"})
+    EXPECT_TRUE(action(shown)->isVisible()) << shown;
+  EXPECT_TRUE(editor.findChild<QMenu*>("mnuView")->menuAction()->isVisible());
+  EXPECT_FALSE(editor.findDialog()->findChild<QPushButton*>("cmdFRShowReplace")->isEnabled());
+
+  // Endings compare with their letter case; other types have no views.
+  EXPECT_TRUE(HasListingViews("/a/b.PRJ"));
+  EXPECT_FALSE(HasListingViews("/a/b.ctl"));
+  EXPECT_FALSE(HasListingViews("/a/b.OUT"));
+  EXPECT_EQ(EditorFilter("Out File (*.OUT)"), "Out File (*.OUT)|*.OUT");
+
+  // Save As in a viewer offers the type's filter.
+  editor.fileSaveAs();
+  ASSERT_EQ(ui.fileDialogs.size(), 1u);
+  EXPECT_EQ(ui.fileDialogs[0].title, "Save As");
+  EXPECT_EQ(ui.fileDialogs[0].filter, "VORN Control Files (*.CTL)|*.CTL");
+  EXPECT_EQ(ui.fileDialogs[0].folder, dir.path());
+}
+
+TEST_F(EditorTest, MissingFileIsReportedAndStatusBarFollowsTheCaret) {
+  editor.showTextEditor(QString::fromStdString(dir.file("gone.OUT")), "Out File (*.OUT)", false);
+  EXPECT_EQ(ui.onlyText(), "The file '" + dir.file("gone.OUT") + "' doesn't exist.");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
+  EXPECT_FALSE(text()->isReadOnly());
+
+  text()->setPlainText("first\nsecond line\nthird");
+  caretAt(0);
+  EXPECT_EQ(status("Line"), "Line Number: 1");
+  EXPECT_EQ(status("Column"), "Column Number: 1");
+  caretAt(6 + 7);  // "second |line"
+  EXPECT_EQ(status("Line"), "Line Number: 2");
+  EXPECT_EQ(status("Column"), "Column Number: 8");
+}
+
+TEST_F(EditorTest, FindStepsThroughOccurrencesWithTheOptions) {
+  editor.showNew("Out File (*.OUT)");
+  text()->setPlainText("Tree tree treetop TREE");
+  caretAt(0);
+  FindReplaceDialog* d = find("tree");
+  EXPECT_TRUE(d->find());
+  EXPECT_EQ(text()->textCursor().selectionStart(), 0);
+  EXPECT_TRUE(d->find());
+  EXPECT_EQ(text()->textCursor().selectionStart(), 5);
+  d->findChild<QCheckBox*>("chkFRMatchWord")->setChecked(true);
+  EXPECT_TRUE(d->find());
+  EXPECT_EQ(text()->textCursor().selectionStart(), 18);  // skips "treetop"
+  EXPECT_FALSE(d->find());
+  EXPECT_EQ(ui.onlyText(), "Search String Not Found.");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+
+  d->findChild<QCheckBox*>("chkFRMatchWord")->setChecked(false);
+  d->findChild<QCheckBox*>("chkFRMatchCase")->setChecked(true);
+  caretAt(0);
+  EXPECT_TRUE(d->find());
+  EXPECT_EQ(text()->textCursor().selectionStart(), 5);
+  EXPECT_TRUE(d->find());
+  EXPECT_EQ(text()->textCursor().selectionStart(), 10);
+}
+
+TEST_F(EditorTest, ReplaceAndReplaceAllCountWhatTheyChanged) {
+  editor.showNew("Out File (*.OUT)");
+  text()->setPlainText("FE:TREE\nFE:POLE\nFE:TREE\n");
+  caretAt(3);
+  FindReplaceDialog* d = find("TREE", "OAK");
+  // Replace on no selection only finds; then replaces the found text.
+  EXPECT_TRUE(d->replace());
+  EXPECT_EQ(text()->toPlainText(), "FE:TREE\nFE:POLE\nFE:TREE\n");
+  EXPECT_TRUE(d->replace());
+  EXPECT_EQ(text()->toPlainText(), "FE:OAK\nFE:POLE\nFE:TREE\n");
+  EXPECT_EQ(text()->textCursor().selectedText(), "TREE");
+  EXPECT_FALSE(d->replace());
+  EXPECT_EQ(text()->toPlainText(), "FE:OAK\nFE:POLE\nFE:OAK\n");
+  EXPECT_EQ(ui.boxes.back().text, "Search String Not Found.");
+
+  // A replacement holding the search text is not replaced again.
+  ui.boxes.clear();
+  caretAt(5);
+  d = find("OAK", "OAK TREE OAK");
+  EXPECT_EQ(d->replaceAll(), 2);
+  EXPECT_EQ(text()->toPlainText(), "FE:OAK TREE OAK\nFE:POLE\nFE:OAK TREE OAK\n");
+  EXPECT_EQ(ui.onlyText(), "Replaced 'OAK' with 'OAK TREE OAK' 2 time(s).");
+  EXPECT_EQ(text()->textCursor().position(), 5);
+  EXPECT_TRUE(editor.changed());
+
+  ui.boxes.clear();
+  caretAt(9);
+  d = find("ELM", "X");
+  EXPECT_EQ(d->replaceAll(), 0);
+  EXPECT_EQ(ui.onlyText(), "Replaced 'ELM' with 'X' 0 time(s).");
+  EXPECT_EQ(text()->textCursor().position(), 9);
+}
+
+TEST_F(EditorTest, SavingWritesCrLfAndTheQuestionGuardsChanges) {
+  const std::string path = dir.write("codes.TRN", "FE:TREE FE:OAK\r\n");
+  editor.showTextEditor(QString::fromStdString(path), "Translation/Filter File (*.TRN)", false);
+  typeAtEnd("FE:POLE FE:MAST\n");
+  EXPECT_TRUE(editor.changed());
+  ASSERT_TRUE(editor.fileSave());
+  EXPECT_EQ(ReadFile(path), "FE:TREE FE:OAK\r\nFE:POLE FE:MAST\r\n");
+  EXPECT_FALSE(editor.changed());
+  EXPECT_EQ(editor.windowTitle(), "VORN Text Editor - " + QString::fromStdString(path));
+
+  // New asks first; No discards.
+  typeAtEnd("scratch");
+  ui.answers.push_back(Answer::No);
+  editor.fileNew();
+  EXPECT_EQ(ui.onlyText(), "Changes have been made.  Would you like to save them?");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::None);
+  EXPECT_EQ(text()->toPlainText(), "");
+  EXPECT_EQ(editor.windowTitle(), "VORN Text Editor");
+
+  // A new text saved with Yes goes through Save As; cancelling Save As
+  // keeps the window and the text.
+  text()->setPlainText("kept");
+  editor.show();
+  ui.boxes.clear();
+  ui.answers.push_back(Answer::Yes);
+  ui.files.push_back(std::nullopt);
+  EXPECT_FALSE(editor.close());
+  EXPECT_EQ(ui.boxes[0].buttons, Buttons::YesNoCancel);
+  EXPECT_TRUE(editor.isVisible());
+  EXPECT_EQ(text()->toPlainText(), "kept");
+  ui.answers.push_back(Answer::Yes);
+  ui.files.push_back(dir.file("new.TRN"));
+  EXPECT_TRUE(editor.close());
+  EXPECT_EQ(ReadFile(dir.file("new.TRN")), "kept");
+}
+
+TEST_F(EditorTest, CloseReloadsFromDiskAndBytesThatAreNotUtf8SurviveASave) {
+  const std::string latin = "PD:CAF\xE9\r\nPN:1\r\n";
+  const std::string path = dir.write("old.CTL", latin);
+  editor.showTextEditor(QString::fromStdString(path), "VORN Control Files (*.CTL)", false);
+  EXPECT_EQ(text()->toPlainText(), QString::fromUtf8("PD:CAF\xC3\xA9\nPN:1\n"));
+  ASSERT_TRUE(editor.fileSave());
+  EXPECT_EQ(ReadFile(path), latin);
+
+  text()->setPlainText("edited");
+  ui.answers.push_back(Answer::No);
+  editor.fileClose();
+  EXPECT_EQ(text()->toPlainText(), QString::fromUtf8("PD:CAF\xC3\xA9\nPN:1\n"));
+  EXPECT_FALSE(editor.changed());
+}
+
+TEST_F(EditorTest, RecordAndListViewsRoundTripThroughTheirWorkingFiles) {
+  const std::string control =
+      CrLf({"AC:PR", "CS:State Plane 1983", "AC:OS", "PN:CP100", "YC:247795.6047",
+            "XC:2072520.8575", "ZC:1102.3400", "PD:IRON PIN FOUND", "AC:OS", "PN:CP101", "YC:1.0"});
+  const std::string path = dir.write("job.CTL", control);
+  editor.showTextEditor(QString::fromStdString(path), "VORN Control Files (*.CTL)", true);
+  action("mnuViewRecord")->trigger();
+  EXPECT_TRUE(action("mnuViewRecord")->isChecked());
+  EXPECT_FALSE(action("mnuViewList")->isChecked());
+  EXPECT_TRUE(ui.boxes.empty()) << ui.onlyText();
+  const QString record = text()->toPlainText();
+  EXPECT_TRUE(
+      record.contains("\nAC:OS  PN:CP100  YC:247795.6047  XC:2072520.8575  ZC:1102.3400\n"
+                      "       PD:IRON PIN FOUND\n\nAC:OS  PN:CP101  YC:1.0"))
+      << record.toStdString();
+  EXPECT_EQ(editor.path(), QString::fromStdString(path + ".rec"));
+  EXPECT_FALSE(std::filesystem::exists(path + ".lst"));
+  EXPECT_TRUE(text()->isReadOnly());
+
+  // Choosing the checked entry again does nothing.
+  action("mnuViewRecord")->trigger();
+  EXPECT_TRUE(action("mnuViewRecord")->isChecked());
+  EXPECT_EQ(text()->toPlainText(), record);
+
+  action("mnuViewList")->trigger();
+  EXPECT_TRUE(action("mnuViewList")->isChecked());
+  std::string listed = control;
+  std::erase(listed, '\r');
+  EXPECT_EQ(text()->toPlainText().toStdString(), listed);
+  EXPECT_EQ(editor.path(), QString::fromStdString(path + ".lst"));
+  EXPECT_FALSE(std::filesystem::exists(path + ".rec"));
+  EXPECT_TRUE(text()->isReadOnly());
+  EXPECT_EQ(ReadFile(path), control);
+}
+
+TEST_F(EditorTest, PrintsEveryPageToAPdf) {
+  editor.showNew("Out File (*.OUT)");
+  QString lines;
+  for (int i = 1; i <= 200; ++i) lines += QString("PN:%1\n").arg(i);
+  text()->setPlainText(lines);
+  QPrinter printer;
+  printer.setOutputFormat(QPrinter::PdfFormat);
+  printer.setOutputFileName(QString::fromStdString(dir.file("out.pdf")));
+  editor.printTo(printer);
+  const std::string pdf = ReadFile(dir.file("out.pdf"));
+  ASSERT_TRUE(pdf.starts_with("%PDF"));
+  // 200 lines do not fit on one page within one-inch margins.
+  size_t pages = 0;
+  for (size_t at = pdf.find("/Type /Page"); at != std::string::npos;
+       at = pdf.find("/Type /Page", at + 1))
+    if (pdf.compare(at, 12, "/Type /Pages") != 0) ++pages;
+  EXPECT_GE(pages, 3u);
+}
+
+}  // namespace
+}  // namespace zv

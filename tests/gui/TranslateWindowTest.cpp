@@ -1,0 +1,236 @@
+#include <gtest/gtest.h>
+
+#include <QCheckBox>
+#include <QComboBox>
+#include <QLabel>
+#include <QLineEdit>
+#include <QPushButton>
+#include <QSignalSpy>
+#include <QTest>
+#include <filesystem>
+
+#include "app/AppContext.h"
+#include "app/dialogs/TranslateWindow.h"
+#include "platform/ScriptedUi.h"
+#include "support/TempDir.h"
+
+namespace zv {
+namespace {
+
+using test::CrLf;
+using test::ReadFile;
+
+const QString kCtl = "VORN Control Files (*.CTL)";
+const QString kPac = "VORN Points and Chains Files (*.PAC)";
+const QString kManual = "Coordinate Conversion Manual Entry";
+
+QStringList Items(const QComboBox* box) {
+  QStringList items;
+  for (int i = 0; i < box->count(); ++i) items << box->itemText(i);
+  return items;
+}
+
+class TranslateWindowTest : public ::testing::Test {
+ protected:
+  TranslateWindowTest() : ctx(ui, dir.path()) {
+    const std::string ctl = kCtl.toStdString(), pac = kPac.toStdString();
+    const std::string manual = kManual.toStdString();
+    dir.write("UTIFiles/A1.uti", CrLf({"ConvertFile", "To PAC", ctl, pac}));
+    dir.write("UTIFiles/A3.uti", CrLf({"Replace", "Filter", ctl, ctl, "CODES.TRN"}));
+    dir.write("UTIFiles/A4.uti", CrLf({"ConvertFile", "Copy", ctl, ctl}));
+    dir.write("UTIFiles/B1.uti", CrLf({"ConvertFile", "To CTL", pac, ctl}));
+    dir.write("UTIFiles/C1.uti", CrLf({"MultiPoint", "Typed", manual, manual}));
+    dir.write("TRNFiles/CODES.TRN", CrLf({"FE:TREE FE:OAK"}));
+    input = dir.write("data/job.ctl", CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0",
+                                            "AC:OS", "PN:CP2", "YC:1100.25"}));
+    ctx.startup.defaultInputFolder = dir.file("data/");
+    ctx.startup.defaultOutputFolder = dir.file("out/");
+    ctx.startup.configurationFolder = dir.file("TRNFiles");
+    std::filesystem::create_directories(dir.file("out"));
+  }
+
+  template <typename T>
+  T* child(const TranslateWindow& w, const char* name) {
+    T* c = w.findChild<T*>(name);
+    EXPECT_NE(c, nullptr) << name;
+    return c;
+  }
+  void select(const TranslateWindow& w, const char* list, const QString& item) {
+    QComboBox* box = child<QComboBox>(w, list);
+    ASSERT_GE(box->findText(item), 0) << item.toStdString();
+    box->setCurrentIndex(box->findText(item));
+  }
+  void setText(const TranslateWindow& w, const char* box, const std::string& text) {
+    child<QLineEdit>(w, box)->setText(QString::fromStdString(text));
+  }
+  void click(const TranslateWindow& w, const char* button) {
+    QTest::mouseClick(child<QPushButton>(w, button), Qt::LeftButton);
+  }
+  bool groupEnabled(const TranslateWindow& w, std::initializer_list<const char*> names) {
+    bool all = true, none = true;
+    for (const char* n : names) {
+      const bool on = child<QWidget>(w, n)->isEnabled();
+      all = all && on;
+      none = none && !on;
+    }
+    EXPECT_TRUE(all || none) << "a group is enabled as a whole: " << *names.begin();
+    return all;
+  }
+
+  test::TempDir dir;
+  ScriptedUi ui;
+  AppContext ctx;
+  std::string input;
+};
+
+const auto kInputGroup = {"lblInputLocation", "txtInputLocation", "cmdInputBrowse"};
+const auto kOutputGroup = {"lblOutputLocation", "txtOutputLocation", "cmdOutputBrowse"};
+const auto kConfigGroup = {"lblActionLocation", "txtActionLocation", "cmdActionBrowse",
+                           "cmdActionNew",      "cmdActionEdit",     "chkActionDefault"};
+
+TEST_F(TranslateWindowTest, ListsCascadeAndLocationGroupsFollowTheChoices) {
+  TranslateWindow w(ctx);
+  w.start();
+  EXPECT_TRUE(ui.boxes.empty());
+  EXPECT_EQ(w.windowTitle().toStdString(), TranslateLogic::Caption());
+  EXPECT_EQ(w.focusWidget(), child<QComboBox>(w, "cmbInputType"));
+  EXPECT_NE(child<QWidget>(w, "tabTranslate"), nullptr);
+  EXPECT_EQ(Items(child<QComboBox>(w, "cmbInputType")), (QStringList{kCtl, kPac, kManual}));
+  EXPECT_EQ(Items(child<QComboBox>(w, "cmbOutputType")), (QStringList{kPac, kCtl}));
+  EXPECT_EQ(child<QComboBox>(w, "cmbAction")->currentText(), "To PAC");
+  EXPECT_TRUE(groupEnabled(w, kInputGroup));
+  EXPECT_TRUE(groupEnabled(w, kOutputGroup));
+  EXPECT_FALSE(groupEnabled(w, kConfigGroup));
+
+  select(w, "cmbOutputType", kCtl);
+  EXPECT_EQ(Items(child<QComboBox>(w, "cmbAction")), (QStringList{"Filter", "Copy"}));
+  EXPECT_TRUE(groupEnabled(w, kConfigGroup));
+  EXPECT_EQ(child<QLineEdit>(w, "txtActionLocation")->text().toStdString(),
+            dir.file("TRNFiles/CODES.TRN"));
+  EXPECT_TRUE(child<QCheckBox>(w, "chkActionDefault")->isChecked());
+
+  select(w, "cmbAction", "Copy");
+  EXPECT_FALSE(groupEnabled(w, kConfigGroup));
+  EXPECT_EQ(child<QLineEdit>(w, "txtActionLocation")->text(), "");
+  EXPECT_FALSE(child<QCheckBox>(w, "chkActionDefault")->isChecked());
+
+  select(w, "cmbInputType", kManual);
+  EXPECT_FALSE(groupEnabled(w, kInputGroup));
+  EXPECT_EQ(child<QLineEdit>(w, "txtInputLocation")->text(), "");
+  EXPECT_FALSE(groupEnabled(w, kOutputGroup));
+  EXPECT_EQ(Items(child<QComboBox>(w, "cmbAction")), QStringList{"Typed"});
+
+  select(w, "cmbInputType", kPac);
+  EXPECT_TRUE(groupEnabled(w, kInputGroup));
+  EXPECT_EQ(child<QLineEdit>(w, "txtInputLocation")->text().toStdString(), dir.file("data/"));
+}
+
+TEST_F(TranslateWindowTest, OkShowsTheChecksOfWhatTheBoxesHold) {
+  TranslateWindow w(ctx);
+  w.start();
+  setText(w, "txtInputLocation", "");
+  click(w, "cmdTranslateOK");
+  setText(w, "txtInputLocation", dir.file("data/none.ctl"));
+  click(w, "cmdTranslateOK");
+  setText(w, "txtInputLocation", input);
+  setText(w, "txtOutputLocation", "");
+  click(w, "cmdTranslateOK");
+  setText(w, "txtOutputLocation", dir.file("DATA/JOB.CTL"));
+  click(w, "cmdTranslateOK");
+  ASSERT_EQ(ui.boxes.size(), 4u);
+  EXPECT_EQ(ui.boxes[0].text, "You must enter an input file location and name.");
+  EXPECT_EQ(ui.boxes[1].text, "The specified input file does not exist.");
+  EXPECT_EQ(ui.boxes[2].text, "You must enter an output file location and name.");
+  EXPECT_EQ(ui.boxes[3].text, "The input and output files can not be the same.");
+  EXPECT_EQ(ui.boxes[3].title, "Incompatible Files");
+  for (const auto& box : ui.boxes) EXPECT_EQ(box.icon, Icon::Exclamation);
+  // The dialog keeps what was typed.
+  EXPECT_EQ(child<QLineEdit>(w, "txtOutputLocation")->text().toStdString(),
+            dir.file("DATA/JOB.CTL"));
+}
+
+TEST_F(TranslateWindowTest, ConvertFileRunsEndToEndAndViewsTheOutput) {
+  ctx.startup.viewOutput = true;
+  TranslateWindow w(ctx);
+  w.start();
+  const std::string output = dir.file("out/job.pac");
+  setText(w, "txtInputLocation", input);
+  setText(w, "txtOutputLocation", output);
+  click(w, "cmdTranslateOK");
+  ASSERT_EQ(ui.boxes.size(), 1u) << ui.boxes[0].text;
+  EXPECT_EQ(ui.boxes[0].text, "Conversion Complete.");
+  EXPECT_EQ(ui.boxes[0].title, "Conversion Complete");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_NE(ReadFile(output).find("PN:CP2\r\nYY:1100.2500\r\n"), std::string::npos);
+  EXPECT_EQ(ui.editors,
+            (std::vector<std::string>{"viewer: " + kPac.toStdString() + ": " + output}));
+  EXPECT_TRUE(w.isVisible());
+}
+
+TEST_F(TranslateWindowTest, CancelRecordsTheLastUsedDefinitionAndTheWindowReopensOnIt) {
+  {
+    TranslateWindow w(ctx);
+    w.start();
+    QSignalSpy ended(&w, &TranslateWindow::ended);
+    select(w, "cmbOutputType", kCtl);
+    select(w, "cmbAction", "Copy");
+    setText(w, "txtInputLocation", input);
+    setText(w, "txtOutputLocation", dir.file("out/copy.ctl"));
+    click(w, "cmdTranslateOK");
+    ASSERT_EQ(ui.onlyText(), "Conversion Complete.");
+    click(w, "cmdTranslateCancel");
+    EXPECT_FALSE(w.isVisible());
+    EXPECT_EQ(ended.count(), 1);
+  }
+  EXPECT_EQ(ReadFile(dir.file("Quorvane.cfg")), CrLf({dir.file("UTIFiles/A4.uti")}));
+
+  AppContext next(ui, dir.path());
+  TranslateWindow again(next);
+  again.start();
+  EXPECT_EQ(child<QComboBox>(again, "cmbInputType")->currentText(), kCtl);
+  EXPECT_EQ(child<QComboBox>(again, "cmbOutputType")->currentText(), kCtl);
+  EXPECT_EQ(child<QComboBox>(again, "cmbAction")->currentText(), "Copy");
+
+  // Closing the window instead of Cancel records nothing.
+  std::filesystem::remove(dir.file("Quorvane.cfg"));
+  again.close();
+  EXPECT_FALSE(std::filesystem::exists(dir.file("Quorvane.cfg")));
+}
+
+TEST_F(TranslateWindowTest, BrowseButtonsFillTheBoxes) {
+  TranslateWindow w(ctx);
+  w.start();
+  select(w, "cmbOutputType", kCtl);
+  ui.files = {dir.file("data/other.ctl"), dir.file("out/x.ctl"), dir.file("TRNFiles/B.TRN")};
+  click(w, "cmdInputBrowse");
+  click(w, "cmdOutputBrowse");
+  click(w, "cmdActionBrowse");
+  EXPECT_EQ(child<QLineEdit>(w, "txtInputLocation")->text().toStdString(),
+            dir.file("data/other.ctl"));
+  EXPECT_EQ(child<QLineEdit>(w, "txtOutputLocation")->text().toStdString(), dir.file("out/x.ctl"));
+  EXPECT_EQ(child<QLineEdit>(w, "txtActionLocation")->text().toStdString(),
+            dir.file("TRNFiles/B.TRN"));
+  EXPECT_FALSE(child<QCheckBox>(w, "chkActionDefault")->isChecked());
+  ASSERT_EQ(ui.fileDialogs.size(), 3u);
+  EXPECT_EQ(ui.fileDialogs[2].title, "Select a Configuration File:");
+  EXPECT_EQ(ui.fileDialogs[2].filter, "Translation/Filter Files (*.TRN)|*.trn");
+  EXPECT_EQ(ui.fileDialogs[2].folder, dir.file("TRNFiles"));
+
+  w.updateConfigFile("/elsewhere/C.TRN");
+  EXPECT_EQ(child<QLineEdit>(w, "txtActionLocation")->text(), "/elsewhere/C.TRN");
+  click(w, "cmdActionEdit");
+  EXPECT_EQ(ui.onlyText(), "The file '/elsewhere/C.TRN' does not exist.");
+}
+
+TEST_F(TranslateWindowTest, NoDefinitionsIsACriticalMessage) {
+  std::filesystem::remove_all(dir.file("UTIFiles"));
+  TranslateWindow w(ctx);
+  w.start();
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].text, "No valid translations were found!");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Critical);
+  EXPECT_EQ(child<QComboBox>(w, "cmbInputType")->count(), 0);
+}
+
+}  // namespace
+}  // namespace zv

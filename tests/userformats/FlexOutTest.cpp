@@ -1,0 +1,280 @@
+#include <gtest/gtest.h>
+
+#include "Version.h"
+#include "geodesy/Angles.h"
+#include "platform/ScriptedUi.h"
+#include "platform/TextIo.h"
+#include "support/TempDir.h"
+#include "userformats/FlexIn.h"
+#include "userformats/FlexOut.h"
+
+namespace zv {
+namespace {
+
+using test::CrLf;
+using test::ReadFile;
+using test::TempDir;
+
+FlexOutFormat Format(std::string delimiter, std::vector<std::string> columns,
+                     std::vector<std::string> order, std::vector<std::string> decimals = {}) {
+  FlexOutFormat f;
+  f.delimiter = std::move(delimiter);
+  f.coordinateType = kPlane;
+  f.columns = std::move(columns);
+  f.order = std::move(order);
+  f.decimalPlaces = std::move(decimals);
+  return f;
+}
+
+SurveyPoint Point(std::string name, double northing, std::string units = kMeters) {
+  SurveyPoint p;
+  p.PointName = std::move(name);
+  p.Northing = northing;
+  p.HorizontalUnits = units;
+  p.VerticalUnits = units;
+  return p;
+}
+
+class FlexOutTest : public ::testing::Test {
+ protected:
+  FlexOutChoices Choices(FlexOutFormat format) {
+    FlexOutChoices c;
+    c.formatName = "Test";
+    c.format = std::move(format);
+    c.horizontalUnits = kMeters;
+    c.verticalUnits = kMeters;
+    c.coordinateSystem = "State Plane 1983";
+    c.zone = "Wisconsin South";
+    c.horizontalDatum = "NAD 83";
+    c.verticalDatum = "NAVD 88";
+    std::tm t{};
+    t.tm_year = 2024 - 1900;
+    t.tm_mon = 2;
+    t.tm_mday = 5;
+    t.tm_hour = 7;
+    t.tm_min = 4;
+    t.tm_sec = 9;
+    c.timestamp = t;
+    return c;
+  }
+  // Writes and returns the file's text.
+  std::string Write(const FlexOutChoices& c) {
+    EXPECT_TRUE(FlexOut(ui, work, dir.path(), out, c)) << ui.onlyText();
+    return ReadFile(out);
+  }
+  TempDir dir;
+  std::string out = dir.file("out.txt");
+  ScriptedUi ui;
+  WorkArea work;
+};
+
+TEST_F(FlexOutTest, DelimitedColumnsAreSortedByOrder) {
+  work.OutputPoints = {Point("7", 10.25)};
+  EXPECT_EQ(Write(Choices(Format("Comma", {"Point ID", "Northing"}, {"2", "1"}, {"", "3"}))),
+            CrLf({"10.250,7"}));
+  // Equal numbers keep the grid order; a literal delimiter of two characters.
+  work.OutputPoints = {Point("7", 10.25)};
+  EXPECT_EQ(Write(Choices(Format(" | ", {"Northing", "Point ID", "Geometry"}, {"2", "1", "2"}))),
+            CrLf({"7 | 10 | P"}));
+  EXPECT_TRUE(ui.boxes.empty());
+}
+
+TEST_F(FlexOutTest, NumberFormatting) {
+  work.OutputPoints = {Point("a", 0.5), Point("b", -12.34), Point("c", 1234.5),
+                       Point("d", kNoValue), Point("e", 0.04)};
+  FlexOutFormat f =
+      Format("Comma", {"Northing", "Northing", "Northing"}, {"1", "2", "3"}, {"2", "1", ""});
+  EXPECT_EQ(Write(Choices(f)), CrLf({"0.50,0.5,0", "-12.34,-12.3,-12", "1234.50,1234.5,1234",
+                                     "-99999.00,-99999.0,-99999", "0.04,0.0,0"}));
+}
+
+TEST_F(FlexOutTest, UnitsAndHemispheresAreConvertedOnceAndStoredBack) {
+  SurveyPoint p = Point("1", 1000, kMeters);
+  p.Easting = 2000;
+  p.Elevation = 100;
+  p.NorthingError = 0.01f;
+  p.ScaleFactor = 0.99996;
+  work.OutputPoints = {p};
+  FlexOutChoices c =
+      Choices(Format("Comma",
+                     {"Northing", "Easting", "Orthometric Height", "Northing Error Estimate",
+                      "Scale Factor", "Northing"},
+                     {"1", "2", "3", "4", "5", "6"}, {"4", "4", "3", "4", "8", "4"}));
+  c.horizontalUnits = kUsSurveyFeet;
+  c.verticalUnits = kInternationalFeet;
+  // The second Northing column must not convert the converted value again.
+  EXPECT_EQ(Write(c), CrLf({"3280.8333,6561.6667,328.084,0.0328,0.99996000,3280.8333"}));
+  EXPECT_NEAR(work.OutputPoints[0].Northing, 3280.833333333, 1e-6);
+  EXPECT_NEAR(work.OutputPoints[0].Elevation, 328.0839895, 1e-9);
+}
+
+TEST_F(FlexOutTest, GeographicColumns) {
+  SurveyPoint p = Point("G", kNoValue);
+  p.Latitude = (43 + 4 / 60.0 + 25.12345 / 3600) * kDegreesToRadians;
+  p.Longitude = (89 + 23 / 60.0 + 51.6 / 3600) * kDegreesToRadians;
+  p.Convergence = kNoValue;
+  work.OutputPoints = {p};
+  FlexOutFormat f = Format("Comma", {"Point ID", "Latitude", "Longitude", "Convergance Angle"},
+                           {"1", "2", "3", "4"}, {"", "5", "5", "1"});
+  FlexOutChoices c = Choices(f);
+  c.horizontalUnits = kFormatDMS;
+  c.longitudeDirection = "E";
+  EXPECT_EQ(Write(c), CrLf({"G,43 04 25.12345,270 36 08.40000,-99999"}));
+  EXPECT_NEAR(work.OutputPoints[0].Longitude, kFullCircle - p.Longitude, 1e-12);
+
+  // With linear horizontal units the angle columns are empty.
+  work.OutputPoints = {p};
+  c.horizontalUnits = kMeters;
+  EXPECT_EQ(Write(c), CrLf({"G,,,"}));
+}
+
+TEST_F(FlexOutTest, HeaderBlock) {
+  work.OutputPoints = {Point("1", 5)};
+  work.OutputHeader.HeaderExtraLines = "PRJ Main St\r\nPRJ phase 2";
+  FlexOutFormat f = Format("Comma", {"Point ID"}, {"1"});
+  f.writeHeader = true;
+  f.headerPrefix = "# ";
+  FlexOutChoices c = Choices(f);
+  c.verticalUnits = kUsSurveyFeet;
+  const std::string vr = "# VR:" + std::string(kAppTitle) + " " + std::to_string(kVersionMajor) +
+                         "." + std::to_string(kVersionMinor) + "." +
+                         std::to_string(kVersionRevision);
+  EXPECT_EQ(
+      Write(c),
+      CrLf({vr, "# CM:03/05/2024 7:04:09", "# CM:FLEXED OUT USING Test", "# CS:State Plane 1983",
+            "# ZN:Wisconsin South", "# HD:NAD 83", "# VD:NAVD 88", "# CM:HORIZONTAL UNITS - Meters",
+            "# CM:VERTICAL UNITS - U.S. Survey Feet", "# PRJ Main St", "# PRJ phase 2", "1"}));
+
+  // Geographic, no vertical datum, no format name, no prefix.
+  f.headerPrefix = "";
+  c = Choices(f);
+  c.formatName = "";
+  c.coordinateSystem = kGeographicCoordinates;
+  c.horizontalUnits = kFormatDecimal;
+  c.verticalDatum = "None";
+  work.OutputHeader.HeaderExtraLines.clear();
+  EXPECT_EQ(Write(c),
+            CrLf({vr.substr(2), "CM:03/05/2024 7:04:09", "CM:FLEXED OUT USING UNDEFINED FORMAT",
+                  "CS:Geographic Coordinates", "HD:NAD 83", "UL:DDD.dddddd", "1"}));
+
+  // Unchecked: the first line is the first point.
+  f.writeHeader = false;
+  EXPECT_EQ(Write(Choices(f)), CrLf({"1"}));
+}
+
+TEST_F(FlexOutTest, TextColumnsKeepTheirTagsOnOneLine) {
+  SurveyPoint p = Point("1", 5);
+  p.DescriptionLines = "PD:OAK\r\nPD:24 IN";
+  p.ExtraLines = "CM:a";
+  p.FeatureCode = "TREE";
+  work.OutputPoints = {p};
+  EXPECT_EQ(Write(Choices(
+                Format(";", {"Point Description", "Attribute", "Feature Code"}, {"1", "2", "3"}))),
+            CrLf({"PD:OAK  PD:24 IN;CM:a;TREE"}));
+  EXPECT_TRUE(ui.boxes.empty());
+}
+
+TEST_F(FlexOutTest, FixedPositionsPadAndCutWithAWarning) {
+  work.OutputPoints = {Point("ABCDEFGH", 12.5), Point("AB", 3)};
+  FlexOutFormat f = Format(kColumnSpecific, {"Northing", "Point ID"}, {"6", "1"}, {"1", ""});
+  EXPECT_EQ(Write(Choices(f)), CrLf({"ABCDE12.5", "AB   3.0"}));
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].title, "Check Output File");
+  EXPECT_EQ(ui.boxes[0].text, "The file '" + out +
+                                  "' was written, but:\r\n1 field(s) were cut short by the next "
+                                  "column's position (first on line 1, column 'Point ID').");
+}
+
+TEST_F(FlexOutTest, FieldsHoldingTheDelimiterAreReported) {
+  SurveyPoint p = Point("1", 5);
+  p.FeatureCode = "OAK TREE";
+  work.OutputPoints = {Point("0", 1), p};
+  EXPECT_EQ(Write(Choices(Format("Space", {"Point ID", "Feature Code"}, {"1", "2"}))),
+            CrLf({"0 ", "1 OAK TREE"}));
+  EXPECT_EQ(ui.onlyText(), "The file '" + out +
+                               "' was written, but:\r\n1 field(s) contain the delimiter and will "
+                               "not read back as one field (first on line 2, column 'Feature "
+                               "Code').");
+}
+
+TEST_F(FlexOutTest, RefusalsWriteNothing) {
+  struct Case {
+    FlexOutFormat format;
+    std::string title;
+    std::string text;
+  };
+  std::vector<Case> cases = {
+      {Format("", {"Point ID"}, {"1"}), "Delimiter Required", "A Delimiter is required."},
+      {Format("Comma", {}, {}), "Specify Columns",
+       "You must specify at least one column to import."},
+      {Format("Comma", {"Point ID", "Northing"}, {"1"}), "Specify Column",
+       "You must specify the column for 'Northing'."},
+      {Format("Comma", {"Point ID"}, {"x"}), "Invalid Column Position",
+       "The position 'x' of the column 'Point ID' is not a whole number from 1 to 32767."},
+      {Format("Comma", {"Northing"}, {"1"}, {"16"}), "Invalid Decimal Places",
+       "The decimal places '16' of the column 'Northing' are not a whole number from 0 to 15."},
+  };
+  work.OutputPoints = {Point("1", 5)};
+  for (const auto& c : cases) {
+    ScriptedUi ui2;
+    EXPECT_FALSE(FlexOut(ui2, work, dir.path(), out, Choices(c.format)));
+    ASSERT_EQ(ui2.boxes.size(), 1u) << c.text;
+    EXPECT_EQ(ui2.boxes[0].title, c.title);
+    EXPECT_EQ(ui2.boxes[0].text, c.text);
+  }
+  work.OutputPoints.clear();
+  EXPECT_FALSE(FlexOut(ui, work, dir.path(), out, Choices(Format("Comma", {"Point ID"}, {"1"}))));
+  EXPECT_EQ(ui.onlyText(), "There are no points to write. The file '" + out + "' was not written.");
+  EXPECT_FALSE(FileExists(out));
+}
+
+TEST_F(FlexOutTest, UnwritableOutputIsReported) {
+  work.OutputPoints = {Point("1", 5)};
+  std::string bad = dir.file("no-such-folder/out.txt");
+  EXPECT_FALSE(FlexOut(ui, work, dir.path(), bad, Choices(Format("Comma", {"Point ID"}, {"1"}))));
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_NE(ui.boxes[0].text.find(bad), std::string::npos);
+}
+
+// Shipped input and output formats of the same name read back what they
+// wrote.
+TEST(FlexOutShipped, RoundTripThroughTheShippedFormats) {
+  const std::string app = ZV_SOURCE_DIR "/appdata";
+  for (std::string name : {"PNEZD Comma", "PNEZD Space", "PNEZD Fixed"}) {
+    ScriptedUi ui;
+    TempDir dir;
+    WorkArea work;
+    FlexInChoices in;
+    in.formatName = name;
+    in.horizontalUnits = kUsSurveyFeet;
+    in.verticalUnits = kUsSurveyFeet;
+    in.verticalDatum = "NAVD 88";
+    std::string sample = app + "/samples/" +
+                         (name == "PNEZD Comma"   ? "sample-pnezd.csv"
+                          : name == "PNEZD Space" ? "sample-pnezd.txt"
+                                                  : "sample-pnezd-fixed.txt");
+    ASSERT_TRUE(FlexIn(ui, work, app, sample, in)) << name << ": " << ui.onlyText();
+    std::vector<SurveyPoint> first = work.InputPoints;
+    work.copyInputToOutput();
+
+    FlexOutChoices outChoices;
+    outChoices.formatName = name;
+    outChoices.horizontalUnits = kUsSurveyFeet;
+    outChoices.verticalUnits = kUsSurveyFeet;
+    outChoices.verticalDatum = "NAVD 88";
+    std::string written = dir.file("out.txt");
+    ASSERT_TRUE(FlexOut(ui, work, app, written, outChoices)) << name << ": " << ui.onlyText();
+    ASSERT_TRUE(FlexIn(ui, work, app, written, in)) << name << ": " << ui.onlyText();
+    EXPECT_TRUE(ui.boxes.empty()) << name << ": " << ui.boxes.size();
+    ASSERT_EQ(work.InputPoints.size(), first.size()) << name;
+    for (size_t i = 0; i < first.size(); ++i) {
+      EXPECT_EQ(work.InputPoints[i].Northing, first[i].Northing) << name << " " << i;
+      EXPECT_EQ(work.InputPoints[i].Easting, first[i].Easting) << name << " " << i;
+      EXPECT_EQ(work.InputPoints[i].Elevation, first[i].Elevation) << name << " " << i;
+      EXPECT_EQ(work.InputPoints[i].FeatureCode, first[i].FeatureCode) << name << " " << i;
+    }
+  }
+}
+
+}  // namespace
+}  // namespace zv
