@@ -26,63 +26,6 @@ bool SameName(std::string_view a, std::string_view b) {
          });
 }
 
-std::string TrimBlanks(std::string_view s) {
-  while (!s.empty() && (s.front() == ' ' || s.front() == '\t')) s.remove_prefix(1);
-  while (!s.empty() && (s.back() == ' ' || s.back() == '\t')) s.remove_suffix(1);
-  return std::string(s);
-}
-
-// One read of a profile file for the lookups of a single operation, with the
-// rules of ReadProfileValue: names compare without regard to letter case, the
-// first section and key of a name count, values are trimmed and an empty
-// value gives the default.
-class ProfileSnapshot {
- public:
-  explicit ProfileSnapshot(const std::string& path) {
-    std::vector<std::string> lines;
-    ReadTextLines(path, lines);
-    for (const std::string& line : lines) {
-      std::string t = TrimBlanks(line);
-      size_t close = t.find(']');
-      if (t.size() >= 2 && t.front() == '[' && close != std::string::npos) {
-        sections_.push_back({TrimBlanks(std::string_view(t).substr(1, close - 1)), {}});
-        continue;
-      }
-      size_t eq = line.find('=');
-      if (sections_.empty() || eq == std::string::npos) continue;
-      std::string_view view(line);
-      sections_.back().keys.emplace_back(TrimBlanks(view.substr(0, eq)),
-                                         TrimBlanks(view.substr(eq + 1)));
-    }
-  }
-
-  bool has(std::string_view section) const { return find(section) != nullptr; }
-
-  std::string value(std::string_view section, std::string_view key,
-                    const std::string& defaultValue) const {
-    const Section* s = find(section);
-    if (!s) return defaultValue;
-    for (const auto& [name, value] : s->keys) {
-      if (!SameName(name, key)) continue;
-      if (value.empty()) return defaultValue;
-      return value.substr(0, kProfileValueLimit);
-    }
-    return defaultValue;
-  }
-
- private:
-  struct Section {
-    std::string name;
-    std::vector<std::pair<std::string, std::string>> keys;
-  };
-  const Section* find(std::string_view section) const {
-    for (const Section& s : sections_) {
-      if (SameName(s.name, section)) return &s;
-    }
-    return nullptr;
-  }
-  std::vector<Section> sections_;
-};
 
 // A list flag ("Show", "Show In", "Show Out") read as a number.
 bool FlagIsOne(const std::string& value, const char* source) {

@@ -10,14 +10,14 @@ namespace zv {
 
 namespace {
 
-std::string Trim(const std::string& s) {
+std::string Trim(std::string_view s) {
   size_t b = s.find_first_not_of(" \t");
   if (b == std::string::npos) return {};
   size_t e = s.find_last_not_of(" \t");
-  return s.substr(b, e - b + 1);
+  return std::string(s.substr(b, e - b + 1));
 }
 
-bool SameName(const std::string& a, const std::string& b) {
+bool SameName(std::string_view a, std::string_view b) {
   return a.size() == b.size() &&
          std::equal(a.begin(), a.end(), b.begin(), [](unsigned char x, unsigned char y) {
            return std::tolower(x) == std::tolower(y);
@@ -64,6 +64,42 @@ Located Locate(const std::string& path, const std::string& section) {
 
 }  // namespace
 
+ProfileSnapshot::ProfileSnapshot(const std::string& path) {
+  std::vector<std::string> lines;
+  ReadTextLines(path, lines);
+  for (const std::string& line : lines) {
+    if (auto name = SectionName(line)) {
+      sections_.push_back({*name, {}});
+    } else if (auto key = KeyName(line); key && !sections_.empty()) {
+      sections_.back().keys.emplace_back(*key,
+                                         Trim(std::string_view(line).substr(line.find('=') + 1)));
+    }
+  }
+}
+
+bool ProfileSnapshot::has(std::string_view section) const {
+  return find(section) != nullptr;
+}
+
+std::string ProfileSnapshot::value(std::string_view section, std::string_view key,
+                                   const std::string& defaultValue) const {
+  const Section* s = find(section);
+  if (!s) return defaultValue;
+  for (const auto& [name, value] : s->keys) {
+    if (!SameName(name, key)) continue;
+    if (value.empty()) return defaultValue;
+    return value.substr(0, kProfileValueLimit);
+  }
+  return defaultValue;
+}
+
+const ProfileSnapshot::Section* ProfileSnapshot::find(std::string_view section) const {
+  for (const Section& s : sections_) {
+    if (SameName(s.name, section)) return &s;
+  }
+  return nullptr;
+}
+
 std::vector<std::string> ReadProfileSections(const std::string& path) {
   std::vector<std::string> lines;
   std::vector<std::string> names;
@@ -92,21 +128,11 @@ std::string ReadProfileSectionsText(const std::string& path) {
 
 std::string ReadProfileValue(const std::string& path, const std::string& section,
                              const std::string& key, const std::string& defaultValue) {
-  Located loc = Locate(path, section);
-  if (!loc.sectionLine) return defaultValue;
-  for (size_t i = *loc.sectionLine + 1; i < loc.sectionEnd; ++i) {
-    auto name = KeyName(loc.lines[i]);
-    if (!name || !SameName(*name, key)) continue;
-    std::string value = Trim(loc.lines[i].substr(loc.lines[i].find('=') + 1));
-    if (value.empty()) return defaultValue;
-    if (value.size() > kProfileValueLimit) value.resize(kProfileValueLimit);
-    return value;
-  }
-  return defaultValue;
+  return ProfileSnapshot(path).value(section, key, defaultValue);
 }
 
-bool WriteProfileValue(const std::string& path, const std::string& section,
-                       const std::string& key, const std::string& value) {
+bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value) {
   Located loc = Locate(path, section);
   std::string newLine = key + "=" + value;
   if (!loc.sectionLine) {

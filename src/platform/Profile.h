@@ -5,12 +5,34 @@
 // a temporary file.
 
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 namespace zv {
 
 inline constexpr size_t kProfileValueLimit = 25000;
 inline constexpr size_t kProfileSectionsLimit = 30000;
+
+// One read of a profile file for the many lookups of a single operation,
+// with the rules of ReadProfileValue.
+class ProfileSnapshot {
+ public:
+  explicit ProfileSnapshot(const std::string& path);
+  bool has(std::string_view section) const;
+  // The value (at most 25000 characters), or the default when the key is
+  // missing or its value is empty.
+  std::string value(std::string_view section, std::string_view key,
+                    const std::string& defaultValue) const;
+
+ private:
+  struct Section {
+    std::string name;
+    std::vector<std::pair<std::string, std::string>> keys;
+  };
+  const Section* find(std::string_view section) const;
+  std::vector<Section> sections_;
+};
 
 // The section names in file order (as the 30000-character NUL-separated
 // buffer holds them). A missing file has no sections.
@@ -25,8 +47,8 @@ std::string ReadProfileValue(const std::string& path, const std::string& section
 
 // Replaces the value in place, or appends the key to its section, or appends
 // the section at the end of the file. False when the file cannot be written.
-bool WriteProfileValue(const std::string& path, const std::string& section,
-                       const std::string& key, const std::string& value);
+bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value);
 
 // Removes a whole section with its keys. True also when there was none.
 bool DeleteProfileSection(const std::string& path, const std::string& section);

@@ -10,7 +10,6 @@
 #include <vector>
 
 #if defined(__linux__)
-#include <sys/mman.h>
 #endif
 
 #include "geodesy/Angles.h"
@@ -87,41 +86,13 @@ double ConvertLength(double value, const std::string& from, const std::string& t
   return Distances_Convert(value, from, to);
 }
 
-// Makes room for the points a stream of this size can hold, so that a large
-// file does not move its points again and again while the list grows.
-// `bytesPerPoint` is a short line of the format; memory that is reserved
-// beyond the points read is never touched.
-void ReservePoints(std::vector<SurveyPoint>& points, std::istream& in, size_t bytesPerPoint) {
-  constexpr size_t kMaxReserve = 4000000;
-  std::streampos here = in.tellg();
-  if (here < 0) return;
-  in.seekg(0, std::ios::end);
-  std::streampos end = in.tellg();
-  in.clear();
-  in.seekg(here);
-  if (end <= here) return;
-  size_t estimate = std::min(static_cast<size_t>(end - here) / bytesPerPoint, kMaxReserve);
-  try {
-    points.reserve(estimate);
-  } catch (const std::bad_alloc&) {
-    return;  // grows as it goes instead
-  }
-#if defined(__linux__)
-  // A large list is faulted in by 2 MB pages rather than by 4 KB ones.
-  constexpr uintptr_t kHuge = 2u << 20;
-  uintptr_t first = (reinterpret_cast<uintptr_t>(points.data()) + kHuge - 1) & ~(kHuge - 1);
-  uintptr_t last = reinterpret_cast<uintptr_t>(points.data() + points.capacity()) & ~(kHuge - 1);
-  if (last > first) madvise(reinterpret_cast<void*>(first), last - first, MADV_HUGEPAGE);
-#endif
-}
-
 class SrvReader {
  public:
   SrvReader(Ui& ui, std::istream& in, const std::string& path)
       : ui_(ui), in_(in), reader_(in), path_(path) {}
 
   bool read(WorkArea& work) {
-    ReservePoints(points_, in_, 32);
+    ReservePoints(points_, BytesLeft(in_) / 32);
     std::string_view line;
     while (reader_.next(line)) {
       ++lineNumber_;

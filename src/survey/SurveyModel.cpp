@@ -1,6 +1,9 @@
 #include "survey/SurveyModel.h"
 
+#include <sys/mman.h>
+
 #include <algorithm>
+#include <new>
 
 namespace zv {
 
@@ -42,6 +45,34 @@ void WorkArea::copyInputToOutput(bool moveInput) {
     OutputPoints = InputPoints;
     OutputChains = InputChains;
   }
+}
+
+void ReservePoints(std::vector<SurveyPoint>& points, std::uintmax_t count) {
+  constexpr std::uintmax_t kMost = 4000000;  // beyond it the list grows as it goes
+  count = std::min(count, kMost);
+  if (count <= points.capacity()) return;
+  try {
+    points.reserve(count);
+  } catch (const std::bad_alloc&) {
+    return;  // the list grows as it goes instead
+  }
+#if defined(__linux__) && defined(MADV_HUGEPAGE)
+  constexpr uintptr_t kHuge = 2u << 20;
+  auto data = reinterpret_cast<uintptr_t>(points.data());
+  uintptr_t begin = (data + kHuge - 1) & ~(kHuge - 1);
+  uintptr_t end = (data + points.capacity() * sizeof(SurveyPoint)) & ~(kHuge - 1);
+  if (end > begin) madvise(reinterpret_cast<void*>(begin), end - begin, MADV_HUGEPAGE);
+#endif
+}
+
+std::uintmax_t BytesLeft(std::istream& in) {
+  std::streampos here = in.tellg();
+  if (here < 0) return 0;
+  in.seekg(0, std::ios::end);
+  std::streampos end = in.tellg();
+  in.clear();
+  in.seekg(here);
+  return end > here ? static_cast<std::uintmax_t>(end - here) : 0;
 }
 
 void AppendLine(std::string& field, std::string_view line) {

@@ -2,6 +2,8 @@
 // The survey model: point, chain and header records and the work area that
 // readers fill and writers consume.
 
+#include <cstdint>
+#include <istream>
 #include <string>
 #include <vector>
 
@@ -54,7 +56,7 @@ struct SurveyChain {
   std::string CodeLetter;
   std::string IntegerAttribute;
   std::string FeatureCode;
-  std::string Description;     // whole "CD:" lines joined by CR LF
+  std::string Description;  // whole "CD:" lines joined by CR LF
   std::string FGText;
   std::string PointListLines;  // whole "PL:" lines joined by CR LF
   std::string ChainLines;      // whole "CH:" lines joined by CR LF
@@ -96,6 +98,14 @@ struct WorkArea {
   // moved rather than copied (for runs that never look at the input again).
   void copyInputToOutput(bool moveInput = false);
 };
+
+// Makes room for `count` points at once (a large list is then faulted in by
+// huge pages where the system offers them). Memory reserved beyond the points
+// stored is never touched; a reservation that cannot be had is skipped.
+void ReservePoints(std::vector<SurveyPoint>& points, std::uintmax_t count);
+// The bytes between the read position of a stream and its end (0 when the
+// stream cannot tell).
+std::uintmax_t BytesLeft(std::istream& in);
 
 // Appends a line to a CR LF-joined text field.
 void AppendLine(std::string& field, std::string_view line);

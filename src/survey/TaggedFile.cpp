@@ -13,7 +13,6 @@
 #include <vector>
 
 #ifdef __linux__
-#include <sys/mman.h>
 #endif
 
 #include "Version.h"
@@ -105,17 +104,6 @@ bool HoldsData(const SurveyPoint& p) {
          p.ScaleFactor != kNoValue || p.HorizontalIsControl || p.ElevationIsControl;
 }
 
-// Large lists are touched page by page as they fill; huge pages make that
-// far cheaper where the system offers them on request.
-void AdviseHugePages([[maybe_unused]] void* data, [[maybe_unused]] size_t bytes) {
-#if defined(__linux__) && defined(MADV_HUGEPAGE)
-  constexpr uintptr_t kHuge = 2u << 20;
-  uintptr_t begin = (reinterpret_cast<uintptr_t>(data) + kHuge - 1) & ~(kHuge - 1);
-  uintptr_t end = (reinterpret_cast<uintptr_t>(data) + bytes) & ~(kHuge - 1);
-  if (end > begin) madvise(reinterpret_cast<void*>(begin), end - begin, MADV_HUGEPAGE);
-#endif
-}
-
 void ReportReadFailure(Ui& ui, const std::string& path, const std::string& reason) {
   ui.message("The file '" + path + "' could not be read." + std::string(kCrLf) + reason,
              Icon::Exclamation, Buttons::Ok, "File Not Read");
@@ -145,9 +133,8 @@ class TaggedReader {
         // Size the list once from the density so far, rather than moving
         // every point at each doubling.
         double perPoint = static_cast<double>(bytesRead) / kEstimateAfter;
-        points_.reserve(static_cast<size_t>(static_cast<double>(sizeHint) / perPoint * 1.1) +
-                        kEstimateAfter);
-        AdviseHugePages(points_.data(), points_.capacity() * sizeof(SurveyPoint));
+        ReservePoints(points_, static_cast<size_t>(static_cast<double>(sizeHint) / perPoint * 1.1) +
+                                   kEstimateAfter);
       }
     }
     if (in.bad()) {

@@ -8,7 +8,6 @@
 #include <vector>
 
 #if defined(__linux__)
-#include <sys/mman.h>
 #endif
 
 #include "geodesy/Angles.h"
@@ -48,40 +47,12 @@ double ToMetres(double value, const std::string& unit) {
   return Distances_Convert(value, unit, "M");
 }
 
-// Makes room for the points a stream of this size can hold, so that a large
-// file does not move its points again and again while the list grows.
-// `bytesPerPoint` is a short line of the format; memory that is reserved
-// beyond the points read is never touched.
-void ReservePoints(std::vector<SurveyPoint>& points, std::istream& in, size_t bytesPerPoint) {
-  constexpr size_t kMaxReserve = 4000000;
-  std::streampos here = in.tellg();
-  if (here < 0) return;
-  in.seekg(0, std::ios::end);
-  std::streampos end = in.tellg();
-  in.clear();
-  in.seekg(here);
-  if (end <= here) return;
-  size_t estimate = std::min(static_cast<size_t>(end - here) / bytesPerPoint, kMaxReserve);
-  try {
-    points.reserve(estimate);
-  } catch (const std::bad_alloc&) {
-    return;  // grows as it goes instead
-  }
-#if defined(__linux__)
-  // A large list is faulted in by 2 MB pages rather than by 4 KB ones.
-  constexpr uintptr_t kHuge = 2u << 20;
-  uintptr_t first = (reinterpret_cast<uintptr_t>(points.data()) + kHuge - 1) & ~(kHuge - 1);
-  uintptr_t last = reinterpret_cast<uintptr_t>(points.data() + points.capacity()) & ~(kHuge - 1);
-  if (last > first) madvise(reinterpret_cast<void*>(first), last - first, MADV_HUGEPAGE);
-#endif
-}
-
 class WsiReader {
  public:
   WsiReader(Ui& ui, std::istream& in) : ui_(ui), in_(in), reader_(in) {}
 
   bool read(WorkArea& work) {
-    ReservePoints(points_, in_, 64);
+    ReservePoints(points_, BytesLeft(in_) / 64);
     header_.HorizontalUnits = kMeters;
     header_.VerticalUnits = kMeters;
     std::string_view line;
