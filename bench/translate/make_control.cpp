@@ -12,9 +12,10 @@ int main(int argc, char** argv) {
   long n = std::atol(argv[1]);
   std::FILE* f = std::fopen(argv[2], "wb");
   if (!f) return 1;
-  std::fputs("PR:Benchmark job\r\nAC:PR\r\nCS:State Plane 1983\r\nZN:Wisconsin Central 4802\r\n"
-             "HD:NAD 83\r\nVD:NAVD 88\r\nUL:F\r\n",
-             f);
+  std::fputs(
+      "PR:Benchmark job\r\nAC:PR\r\nCS:State Plane 1983\r\nZN:Wisconsin Central 4802\r\n"
+      "HD:NAD 83\r\nVD:NAVD 88\r\nUL:F\r\n",
+      f);
   for (long i = 0; i < n; ++i) {
     double north = 240000.0 + (i % 1000) * 12.3456;
     double east = 2070000.0 + (i / 1000) * 9.8765;

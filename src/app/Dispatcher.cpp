@@ -20,8 +20,7 @@ bool Translate(AppContext& ctx, const TranslationJob& job) {
     call.configurationPath.clear();
   } else {
     if (!FileExists(job.definitionPath)) {
-      ctx.ui.exclaim("The specified translation file '" + job.definitionPath +
-                     "' does not exist.");
+      ctx.ui.exclaim("The specified translation file '" + job.definitionPath + "' does not exist.");
       return false;
     }
     if (!FileExists(job.inputPath)) {

@@ -28,8 +28,7 @@ constexpr FileType kTypes[] = {
     {"VORN Control Files (*.CTL)", Adapt<ReadControlFile>, Adapt<WriteControlFile>,
      Adapt<WriteControlFile>},
     {"VORN Project Files (*.PRJ)", Adapt<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
-    {"VORN Edited Project Files (*.EDI)", Adapt<ReadProjectFile>, nullptr,
-     Adapt<WriteProjectFile>},
+    {"VORN Edited Project Files (*.EDI)", Adapt<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
     {"VORN Calculated Files (*.CAL)", Adapt<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
     {"VORN Points and Chains Files (*.PAC)", Adapt<ReadPointsChainsFile>,
      Adapt<WritePointsChainsFile>, Adapt<WritePointsChainsFile>},
@@ -41,7 +40,9 @@ constexpr FileType kTypes[] = {
 
 }  // namespace
 
-std::span<const FileType> FileTypes() { return kTypes; }
+std::span<const FileType> FileTypes() {
+  return kTypes;
+}
 
 const FileType* FindFileType(std::string_view name) {
   for (const auto& t : kTypes)

@@ -26,7 +26,6 @@ bool SameName(std::string_view a, std::string_view b) {
          });
 }
 
-
 // A list flag ("Show", "Show In", "Show Out") read as a number.
 bool FlagIsOne(const std::string& value, const char* source) {
   std::optional<double> v = ToNumber(value);

@@ -8,7 +8,9 @@ namespace zv {
 
 namespace {
 
-bool IsBlank(char c) { return c == ' ' || c == '\t'; }
+bool IsBlank(char c) {
+  return c == ' ' || c == '\t';
+}
 
 std::string_view Trim(std::string_view s) {
   while (!s.empty() && IsBlank(s.front())) s.remove_prefix(1);
@@ -16,7 +18,9 @@ std::string_view Trim(std::string_view s) {
   return s;
 }
 
-bool IsDigit(char c) { return c >= '0' && c <= '9'; }
+bool IsDigit(char c) {
+  return c >= '0' && c <= '9';
+}
 
 }  // namespace
 
@@ -49,8 +53,8 @@ std::optional<double> ToNumber(std::string_view text) {
   auto [ptr, ec] = std::from_chars(s.data(), s.data() + s.size(), value);
   if (ec == std::errc::result_out_of_range) {
     // Underflow reads as zero; overflow is not a usable number.
-    bool negativeExponent = s.find("e-") != std::string_view::npos ||
-                            s.find("E-") != std::string_view::npos;
+    bool negativeExponent =
+        s.find("e-") != std::string_view::npos || s.find("E-") != std::string_view::npos;
     if (negativeExponent) return 0.0;
     return std::nullopt;
   }

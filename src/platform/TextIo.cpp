@@ -1,12 +1,12 @@
 #include "platform/TextIo.h"
 
+#include <unistd.h>
+
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <random>
-
-#include <unistd.h>
 
 namespace zv {
 
@@ -78,9 +78,9 @@ bool TextFileWriter::open() {
   std::filesystem::path folder = target.parent_path();
   std::random_device rd;
   for (int attempt = 0; attempt < 5 && !file_; ++attempt) {
-    std::filesystem::path temp = folder / ("." + target.filename().string() + "." +
-                                           std::to_string(getpid()) + "." +
-                                           std::to_string(rd() % 100000) + ".tmp");
+    std::filesystem::path temp =
+        folder / ("." + target.filename().string() + "." + std::to_string(getpid()) + "." +
+                  std::to_string(rd() % 100000) + ".tmp");
     tempPath_ = temp.string();
     file_ = std::fopen(tempPath_.c_str(), "wbx");
     if (!file_ && errno != EEXIST) break;

@@ -1,7 +1,6 @@
-#include "app/Catalogue.h"
-
 #include <gtest/gtest.h>
 
+#include "app/Catalogue.h"
 #include "support/TempDir.h"
 
 namespace zv {
@@ -56,7 +55,9 @@ TEST_F(CatalogueTest, BareConfigNameIsMadeAbsoluteShortFilesAreSkipped) {
   EXPECT_EQ(cat.definitions()[1].ConfigFile, "");
 }
 
-TEST_F(CatalogueTest, EmptyFolderLoadsNothing) { EXPECT_FALSE(cat.load(dir.path())); }
+TEST_F(CatalogueTest, EmptyFolderLoadsNothing) {
+  EXPECT_FALSE(cat.load(dir.path()));
+}
 
 TEST_F(CatalogueTest, LastUsedRoundTripAndDefaultConfigurationUpdate) {
   def("a", {"ConvertFile", "Copy", kCtl, kCtl});

@@ -1,8 +1,7 @@
-#include "app/Dispatcher.h"
-
 #include <gtest/gtest.h>
 
 #include "app/AppContext.h"
+#include "app/Dispatcher.h"
 #include "platform/ScriptedUi.h"
 #include "support/TempDir.h"
 
@@ -15,9 +14,9 @@ using test::ReadFile;
 const std::string kCtl = "VORN Control Files (*.CTL)";
 const std::string kPac = "VORN Points and Chains Files (*.PAC)";
 
-const std::string kControl = CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0",
-                                   "ZC:300.5", "PD:IRON PIN", "AC:OS", "PN:CP2", "YC:1100.25",
-                                   "XC:2050.75", "ZC:301.0"});
+const std::string kControl =
+    CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0", "ZC:300.5", "PD:IRON PIN", "AC:OS",
+          "PN:CP2", "YC:1100.25", "XC:2050.75", "ZC:301.0"});
 
 class DispatcherTest : public ::testing::Test {
  protected:
@@ -60,16 +59,16 @@ TEST_F(DispatcherTest, ChecksComeInOrderWithTheirMessages) {
   EXPECT_FALSE(run("NOPE", input, output));
   EXPECT_FALSE(run("CTL2PAC", dir.file("missing.ctl"), output));
   ASSERT_EQ(ui.boxes.size(), 2u);
-  EXPECT_EQ(ui.boxes[0].text, "The specified translation file '" +
-                                  dir.file("UTIFiles/NOPE.uti") + "' does not exist.");
+  EXPECT_EQ(ui.boxes[0].text, "The specified translation file '" + dir.file("UTIFiles/NOPE.uti") +
+                                  "' does not exist.");
   EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
   EXPECT_EQ(ui.boxes[1].text,
             "The specified input file '" + dir.file("missing.ctl") + "' does not exist.");
 
   ui.boxes.clear();
   EXPECT_FALSE(run("CTL2PAC", input, output, dir.file("none.trn")));
-  EXPECT_EQ(ui.onlyText(), "The specified Translation/Filter file '" + dir.file("none.trn") +
-                               "' does not exist.");
+  EXPECT_EQ(ui.onlyText(),
+            "The specified Translation/Filter file '" + dir.file("none.trn") + "' does not exist.");
 }
 
 TEST_F(DispatcherTest, AnsweringNoKeepsTheExistingOutput) {

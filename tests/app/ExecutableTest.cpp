@@ -59,8 +59,9 @@ TEST_F(ExecutableTest, OverwriteQuestionReadsStandardInput) {
   work.write("job.pac", "keep me\r\n");
   Result no = run("'-t|CTL2PAC|samples/sample.ctl|job.pac'");
   EXPECT_EQ(no.status, 1);
-  EXPECT_EQ(no.err, "none: VORN Zurevazidu\nThe specified output file 'job.pac' already exists."
-                    "  Overwrite it?\n\n[Yes/No]? ");
+  EXPECT_EQ(no.err,
+            "none: VORN Zurevazidu\nThe specified output file 'job.pac' already exists."
+            "  Overwrite it?\n\n[Yes/No]? ");
   EXPECT_EQ(ReadFile(work.file("job.pac")), "keep me\r\n");
 
   Result yes = run("'-t|CTL2PAC|samples/sample.ctl|job.pac'", "y\n");

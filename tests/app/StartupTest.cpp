@@ -1,10 +1,9 @@
-#include "app/Startup.h"
-
 #include <gtest/gtest.h>
 
 #include <sstream>
 
 #include "app/AppContext.h"
+#include "app/Startup.h"
 #include "platform/ScriptedUi.h"
 #include "support/TempDir.h"
 

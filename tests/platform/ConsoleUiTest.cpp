@@ -1,9 +1,8 @@
-#include "platform/ConsoleUi.h"
-
 #include <gtest/gtest.h>
 
 #include <sstream>
 
+#include "platform/ConsoleUi.h"
 #include "support/TempDir.h"
 
 namespace zv {
@@ -18,8 +17,8 @@ struct Console {
 
 TEST(ConsoleUiTest, MessageLayoutFollowsTheContract) {
   Console c("");
-  c.ui.message("Invalid VORN Control File 'x'.\r\nError on line 4.", Icon::Exclamation,
-               Buttons::Ok, "Invalid VORN Control File");
+  c.ui.message("Invalid VORN Control File 'x'.\r\nError on line 4.", Icon::Exclamation, Buttons::Ok,
+               "Invalid VORN Control File");
   c.ui.inform("Incorrect Number of Command Line Arguments.", "");
   EXPECT_EQ(c.err.str(),
             "exclamation: Invalid VORN Control File\nInvalid VORN Control File 'x'.\n"

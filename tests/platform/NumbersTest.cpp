@@ -1,6 +1,6 @@
-#include "platform/Numbers.h"
-
 #include <gtest/gtest.h>
+
+#include "platform/Numbers.h"
 
 namespace zv {
 namespace {
@@ -9,8 +9,8 @@ TEST(NumbersTest, NumericTestAcceptsSignedDecimalsWithBlanks) {
   for (const char* ok : {"0", "-1", "+2.5", " 12.3456 ", ".5", "5.", "1e3", "-2.5E-04", "\t7"}) {
     EXPECT_TRUE(IsNumeric(ok)) << ok;
   }
-  for (const char* bad : {"", " ", "-", ".", "1.2.3", "12a", "1e", "1,000", "--1", "0x10",
-                          "nan", "inf", "1 2"}) {
+  for (const char* bad :
+       {"", " ", "-", ".", "1.2.3", "12a", "1e", "1,000", "--1", "0x10", "nan", "inf", "1 2"}) {
     EXPECT_FALSE(IsNumeric(bad)) << bad;
   }
   EXPECT_DOUBLE_EQ(*ToNumber(" -12.25 "), -12.25);

@@ -1,7 +1,6 @@
-#include "platform/Profile.h"
-
 #include <gtest/gtest.h>
 
+#include "platform/Profile.h"
 #include "support/TempDir.h"
 
 namespace zv {
@@ -13,10 +12,11 @@ using test::TempDir;
 
 TEST(ProfileTest, NamesIgnoreLetterCaseValuesDoNot) {
   TempDir dir;
-  std::string ini = dir.write("zones.ini", "[State Plane 1983~North]\nFull Name = North Zone \n"
-                                           "Show In=\n[Other]\nkey=Value\n");
+  std::string ini = dir.write("zones.ini",
+                              "[State Plane 1983~North]\nFull Name = North Zone \n"
+                              "Show In=\n[Other]\nkey=Value\n");
   EXPECT_EQ(ReadProfileValue(ini, "state plane 1983~NORTH", "full name", "x"), "North Zone");
-  EXPECT_EQ(ReadProfileValue(ini, "State Plane 1983~North", "Show In", "1"), "1");  // empty
+  EXPECT_EQ(ReadProfileValue(ini, "State Plane 1983~North", "Show In", "1"), "1");   // empty
   EXPECT_EQ(ReadProfileValue(ini, "State Plane 1983~North", "Show Out", "1"), "1");  // missing
   EXPECT_EQ(ReadProfileValue(ini, "Missing", "key", "dflt"), "dflt");
   EXPECT_EQ(ReadProfileValue(dir.file("none.ini"), "Other", "key", "d"), "d");
@@ -33,9 +33,8 @@ TEST(ProfileTest, WritesUpdateInPlaceAppendAndKeepFileOrder) {
   ASSERT_TRUE(WriteProfileValue(ini, "NAD 27", "NAD 83", "NADCON NAD 27 to NAD 83"));
   ASSERT_TRUE(WriteProfileValue(ini, "NGVD 29", "Type", "Vertical"));
   EXPECT_EQ(ReadFile(ini),
-            CrLf({"; catalog", "[NAD 27]", "TYPE=3D", "Show In=1",
-                  "NAD 83=NADCON NAD 27 to NAD 83", "", "[NAVD 88]", "Type=Vertical", "",
-                  "[NGVD 29]", "Type=Vertical"}));
+            CrLf({"; catalog", "[NAD 27]", "TYPE=3D", "Show In=1", "NAD 83=NADCON NAD 27 to NAD 83",
+                  "", "[NAVD 88]", "Type=Vertical", "", "[NGVD 29]", "Type=Vertical"}));
 
   ASSERT_TRUE(DeleteProfileSection(ini, "navd 88"));
   EXPECT_EQ(ReadProfileSections(ini), (std::vector<std::string>{"NAD 27", "NGVD 29"}));

@@ -1,10 +1,9 @@
-#include "platform/TextIo.h"
-
 #include <gtest/gtest.h>
 
 #include <filesystem>
 #include <sstream>
 
+#include "platform/TextIo.h"
 #include "support/TempDir.h"
 
 namespace zv {
