@@ -193,6 +193,28 @@ bool LocalRun(Ui& ui, const ToolPlace& place) {
   return RunTool(ui, place, kLocal);
 }
 
+std::string ConvertReportPath(const ToolPlace& place) {
+  return place.jobFolder + "/Convert.out";
+}
+
+std::string SortReportPath(const ToolPlace& place) {
+  return place.jobFolder + "/PTNUM.INF";
+}
+
+bool AskAnyMatch(Ui& ui) {
+  return ui.askYesNo("Is extract by any match?", "Any Match?");
+}
+
+std::optional<double> AskLlevLimit(Ui& ui) {
+  std::optional<std::string> answer =
+      ui.input("Upper limit point number used to exclude points from VORN Project File:",
+               "Enter Point Number", "");
+  if (!answer || answer->empty()) return 0.0;
+  std::optional<double> number = ToNumber(*answer);
+  if (!number) ui.exclaim("You must enter a numeric point number.");
+  return number;
+}
+
 // --- Routines of the unattended dispatcher ---
 
 bool ConvertToolRoutine(AppContext& ctx, const RoutineCall& call) {
@@ -200,9 +222,9 @@ bool ConvertToolRoutine(AppContext& ctx, const RoutineCall& call) {
   if (!ConvertToolJob(ctx.ui, call.inputPath, call.outputPath, call.configurationPath, place)) {
     return false;
   }
-  const std::string report = place.jobFolder + "/Convert.out";
+  const std::string report = ConvertReportPath(place);
   if (FileExists(report)) {
-    ctx.ui.inform("The following codes had no match.");
+    ctx.ui.inform(kNoMatchText);
     ctx.ui.viewText(report, "Out File (*.OUT)");
   }
   return true;
@@ -217,31 +239,21 @@ bool Pi2PcptToolRoutine(AppContext& ctx, const RoutineCall& call) {
 }
 
 bool ExtractToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  bool anyMatch = ctx.ui.askYesNo("Is extract by any match?", "Any Match?");
+  bool anyMatch = AskAnyMatch(ctx.ui);
   return ExtractToolJob(ctx.ui, call.inputPath, call.outputPath, call.configurationPath, anyMatch,
                         PintrelPlace(ctx.appFolder));
 }
 
 bool LlevToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  std::optional<std::string> answer =
-      ctx.ui.input("Upper limit point number used to exclude points from VORN Project File:",
-                   "Enter Point Number", "");
-  double limit = 0;
-  if (answer && !answer->empty()) {
-    std::optional<double> number = ToNumber(*answer);
-    if (!number) {
-      ctx.ui.exclaim("You must enter a numeric point number.");
-      return false;
-    }
-    limit = *number;
-  }
-  return LlevToolJob(ctx.ui, call.inputPath, call.outputPath, limit, PintrelPlace(ctx.appFolder));
+  std::optional<double> limit = AskLlevLimit(ctx.ui);
+  if (!limit) return false;
+  return LlevToolJob(ctx.ui, call.inputPath, call.outputPath, *limit, PintrelPlace(ctx.appFolder));
 }
 
 bool SortToolRoutine(AppContext& ctx, const RoutineCall& call) {
   ToolPlace place = PintrelPlace(ctx.appFolder);
   if (!SortToolJob(ctx.ui, call.inputPath, call.outputPath, place)) return false;
-  const std::string report = place.jobFolder + "/PTNUM.INF";
+  const std::string report = SortReportPath(place);
   if (FileExists(report)) {
     ctx.ui.viewText(report, "Available Point Numbers");
     std::error_code ec;

@@ -7,6 +7,7 @@
 // cannot be started, is reported by name and the job returns false. Errors
 // creating the empty output file or the job file are reported the same way.
 
+#include <optional>
 #include <string>
 
 #include "app/Routines.h"
@@ -57,6 +58,18 @@ bool LocalLocalToGridJob(Ui& ui, const std::string& input, const std::string& ou
                          const std::string& text1, const std::string& text2,
                          const std::string& text3, const ToolPlace& place);
 bool LocalRun(Ui& ui, const ToolPlace& place);
+
+// Report files the tools leave in their job folder: the codes CONVERT.EXE
+// found no match for, and the free point numbers of SORT.EXE.
+std::string ConvertReportPath(const ToolPlace& place);
+std::string SortReportPath(const ToolPlace& place);
+inline constexpr const char* kNoMatchText = "The following codes had no match.";
+
+// The questions asked before EXTRACT.EXE and LLEV.EXE run. The limit is 0
+// for an empty or cancelled answer, nullopt (reported) for one that is not
+// a number.
+bool AskAnyMatch(Ui& ui);
+std::optional<double> AskLlevLimit(Ui& ui);
 
 // Routines of the unattended dispatcher (tools in appFolder/Pintrel,
 // window at 0, 0), with their questions and report files.

@@ -1,12 +1,17 @@
 #include "app/WindowRoutines.h"
 
+#include <filesystem>
+
 #include "app/AppContext.h"
+#include "app/ToolJobs.h"
 #include "platform/TextIo.h"
 #include "tools/SearchReplace.h"
 
 namespace zv {
 
 namespace {
+
+constexpr const char* kTranslationComplete = "Translation Complete.";
 
 bool RunLong(WindowRun& run, const std::function<bool()>& work) {
   return run.runLong ? run.runLong(work) : work();
@@ -33,11 +38,109 @@ bool RunReplace(WindowRun& run) {
       })) {
     return false;
   }
-  Complete(run, "Translation Complete.", kAppTitle);
+  Complete(run, kTranslationComplete, kAppTitle);
+  return true;
+}
+
+// The window has no console position of its own yet: tools open at 0, 0.
+ToolPlace PlaceOf(const WindowRun& run) {
+  return PintrelPlace(run.ctx.appFolder);
+}
+
+// A tool's report in a viewer window, then deleted. A report no window
+// could show stays for the user to find.
+void ShowAndDeleteReport(Ui& ui, const std::string& path, const std::string& type) {
+  if (!ui.openEditor(path, type, EditorMode::Viewer)) return;
+  std::error_code ec;
+  std::filesystem::remove(path, ec);
+}
+
+// A tool failing to run has shown its own message; no completion follows.
+bool RunConvertTool(WindowRun& run) {
+  if (!CheckConfiguration(run)) return false;
+  const RoutineCall& c = run.call;
+  const ToolPlace place = PlaceOf(run);
+  if (!RunLong(run, [&] {
+        return ConvertToolJob(run.ctx.ui, c.inputPath, c.outputPath, c.configurationPath, place);
+      })) {
+    return false;
+  }
+  const std::string report = ConvertReportPath(place);
+  if (FileExists(report)) {
+    run.ctx.ui.setBusy(false);
+    run.ctx.ui.inform(kNoMatchText);
+    ShowAndDeleteReport(run.ctx.ui, report, "Out File (*.OUT)");
+  } else {
+    Complete(run, kTranslationComplete, kAppTitle);
+  }
+  return true;
+}
+
+using TwoPathToolJob = bool (*)(Ui&, const std::string&, const std::string&, const ToolPlace&);
+
+template <TwoPathToolJob job>
+bool RunTwoPathTool(WindowRun& run) {
+  const RoutineCall& c = run.call;
+  if (!RunLong(run, [&] { return job(run.ctx.ui, c.inputPath, c.outputPath, PlaceOf(run)); })) {
+    return false;
+  }
+  Complete(run, kTranslationComplete, kAppTitle);
+  return true;
+}
+
+bool RunExtractTool(WindowRun& run) {
+  if (!CheckConfiguration(run)) return false;
+  const bool anyMatch = AskAnyMatch(run.ctx.ui);
+  const RoutineCall& c = run.call;
+  if (!RunLong(run, [&] {
+        return ExtractToolJob(run.ctx.ui, c.inputPath, c.outputPath, c.configurationPath, anyMatch,
+                              PlaceOf(run));
+      })) {
+    return false;
+  }
+  Complete(run, kTranslationComplete, kAppTitle);
+  return true;
+}
+
+bool RunLlevTool(WindowRun& run) {
+  const std::optional<double> limit = AskLlevLimit(run.ctx.ui);
+  if (!limit) return false;
+  const RoutineCall& c = run.call;
+  if (!RunLong(run, [&] {
+        return LlevToolJob(run.ctx.ui, c.inputPath, c.outputPath, *limit, PlaceOf(run));
+      })) {
+    return false;
+  }
+  Complete(run, kTranslationComplete, kAppTitle);
+  return true;
+}
+
+bool RunSortTool(WindowRun& run) {
+  const RoutineCall& c = run.call;
+  const ToolPlace place = PlaceOf(run);
+  if (!RunLong(run, [&] { return SortToolJob(run.ctx.ui, c.inputPath, c.outputPath, place); })) {
+    return false;
+  }
+  const std::string report = SortReportPath(place);
+  if (!FileExists(report)) {
+    run.ctx.ui.setBusy(false);
+    run.ctx.ui.inform("The Translation appears to have failed.");
+    return false;
+  }
+  Complete(run, kTranslationComplete, kAppTitle);
+  ShowAndDeleteReport(run.ctx.ui, report, "Available Point Numbers");
   return true;
 }
 
 constexpr WindowRoutine kWindowRoutines[] = {
+    {"CONVERT.EXE", RunConvertTool},
+    {"PCPT2PI.EXE", RunTwoPathTool<Pcpt2PiToolJob>},
+    {"PI2PCPT.EXE", RunTwoPathTool<Pi2PcptToolJob>},
+    {"EXTRACT.EXE", RunExtractTool},
+    {"LLEV.EXE", RunLlevTool},
+    {"SORT.EXE", RunSortTool},
+    {"CTL2ARE.EXE", RunTwoPathTool<Ctl2AreToolJob>},
+    {"ALI2FLA.EXE", RunTwoPathTool<Ali2FlaToolJob>},
     {"ConvertFile", RunConvertFile},
     {"Replace", RunReplace},
 };

@@ -53,6 +53,19 @@ double ParseDecimal(std::string_view s, const char* routine) {
 // Rounds to 15 significant digits (the precision the angle arithmetic keeps).
 double Round15(double v) {
   if (v == 0 || !std::isfinite(v)) return v;
+  // 15 significant digits are 14 - (decimal exponent) decimals.
+  static constexpr double kPowers[] = {1e0, 1e1, 1e2, 1e3, 1e4, 1e5, 1e6, 1e7, 1e8};
+  double magnitude = std::abs(v);
+  int exponent = 0;
+  if (magnitude >= 1 && magnitude < 1e8) {
+    while (magnitude >= kPowers[exponent + 1]) ++exponent;
+  } else {
+    exponent = static_cast<int>(std::floor(std::log10(magnitude)));
+    if (magnitude >= std::pow(10.0, exponent + 1)) ++exponent;
+    if (magnitude < std::pow(10.0, exponent)) --exponent;
+  }
+  int decimals = 14 - exponent;
+  if (decimals >= 0 && decimals <= 22) return RoundToDecimals(v, decimals);
   char buf[40];
   auto res = std::to_chars(buf, buf + sizeof buf, v, std::chars_format::scientific, 14);
   double out = v;
@@ -120,19 +133,13 @@ struct DmsText {
 
 // The degrees of step "decimal text with decimals + 4 digits, read back".
 double RoundedDegrees(double radians, int decimals) {
-  char buf[400];
-  auto res = std::to_chars(buf, buf + sizeof buf, radians * kRadiansToDegrees,
-                           std::chars_format::fixed, decimals + 4);
-  double d = 0;
-  if (res.ec == std::errc()) std::from_chars(buf, res.ptr, d);
-  return d;
+  return RoundToDecimals(radians * kRadiansToDegrees, decimals + 4);
 }
 
 // Zero-filled to two integer digits with exactly `decimals` decimals.
 size_t FormatTwoDigits(char* out, size_t size, double value, int decimals) {
-  char buf[48];
-  auto res = std::to_chars(buf, buf + sizeof buf, value, std::chars_format::fixed, decimals);
-  size_t len = static_cast<size_t>(res.ptr - buf);
+  char buf[400];
+  size_t len = FormatFixedTo(buf, value, decimals);
   size_t whole = 0;
   while (whole < len && IsDigit(buf[whole])) ++whole;
   size_t n = 0;
@@ -164,7 +171,8 @@ DmsText SplitDms(Ui& ui, double radians, int decimals) {
   double wm = std::trunc(m);
   double s = (m - wm) * 60;
   bool minutesOk = wm >= 0 && wm <= 59;
-  if (!CheckLimits(ui, QuoteValue(minutesOk ? s : wm), wm, s)) {
+  bool secondsOk = s >= 0 && s <= kMaxSeconds;
+  if (!(minutesOk && secondsOk) && !CheckLimits(ui, QuoteValue(minutesOk ? s : wm), wm, s)) {
     t.ok = false;
     return t;
   }

@@ -62,18 +62,78 @@ std::optional<double> ToNumber(std::string_view text) {
   return value;
 }
 
+namespace {
+
+constexpr double kPow10[] = {1e0,  1e1,  1e2,  1e3,  1e4,  1e5,  1e6,  1e7,  1e8,  1e9,  1e10, 1e11,
+                             1e12, 1e13, 1e14, 1e15, 1e16, 1e17, 1e18, 1e19, 1e20, 1e21, 1e22};
+
+// The integer nearest to value x 10^decimals, rounded as the exact decimal
+// expansion of the double rounds. The product is formed in extended
+// precision, whose error stays far below the guard band around a tie; near a
+// tie, or out of range, it answers false and the caller takes the exact path.
+bool ScaledRound(double value, int decimals, long long& rounded) {
+  if (decimals < 0 || decimals > 22 || !std::isfinite(value)) return false;
+  long double scaled = static_cast<long double>(value) * kPow10[decimals];
+  long double magnitude = scaled < 0 ? -scaled : scaled;
+  if (magnitude >= 1e15L) return false;
+  long double whole = std::floor(magnitude);
+  long double fraction = magnitude - whole;
+  if (std::fabs(fraction - 0.5L) < 2e-4L) return false;
+  long long m = static_cast<long long>(whole) + (fraction > 0.5L ? 1 : 0);
+  rounded = scaled < 0 ? -m : m;
+  return true;
+}
+
+}  // namespace
+
+size_t FormatFixedTo(char* buffer, double value, int decimals) {
+  long long r = 0;
+  if (decimals <= 18 && ScaledRound(value, decimals, r)) {
+    char* p = buffer;
+    if (r < 0) *p++ = '-';  // a value that rounds to zero has no sign
+    unsigned long long m = r < 0 ? static_cast<unsigned long long>(-r) : r;
+    char digits[24];
+    int n = 0;
+    do {
+      digits[n++] = static_cast<char>('0' + m % 10);
+      m /= 10;
+    } while (m > 0);
+    while (n <= decimals) digits[n++] = '0';  // at least one whole digit
+    for (int i = n - 1; i >= decimals; --i) *p++ = digits[i];
+    if (decimals > 0) {
+      *p++ = '.';
+      for (int i = decimals - 1; i >= 0; --i) *p++ = digits[i];
+    }
+    return static_cast<size_t>(p - buffer);
+  }
+  auto [ptr, ec] = std::to_chars(buffer, buffer + 400, value, std::chars_format::fixed, decimals);
+  if (ec != std::errc()) {
+    buffer[0] = '0';
+    return 1;
+  }
+  size_t len = static_cast<size_t>(ptr - buffer);
+  if (buffer[0] == '-' &&
+      std::string_view(buffer, len).find_first_of("123456789") == std::string_view::npos) {
+    std::memmove(buffer, buffer + 1, --len);  // no negative zero
+  }
+  return len;
+}
+
 void AppendFixed(std::string& out, double value, int decimals) {
   char buf[400];
-  auto [ptr, ec] = std::to_chars(buf, buf + sizeof buf, value, std::chars_format::fixed, decimals);
-  if (ec != std::errc()) {
-    out += "0";
-    return;
-  }
-  std::string_view text(buf, static_cast<size_t>(ptr - buf));
-  if (text.front() == '-' && text.find_first_of("123456789") == std::string_view::npos) {
-    text.remove_prefix(1);  // no negative zero
-  }
-  out.append(text);
+  out.append(buf, FormatFixedTo(buf, value, decimals));
+}
+
+double RoundToDecimals(double value, int decimals) {
+  long long r = 0;
+  // r and 10^decimals are exact doubles, so one correctly rounded division
+  // gives the double nearest to the decimal text.
+  if (ScaledRound(value, decimals, r)) return static_cast<double>(r) / kPow10[decimals];
+  char buf[400];
+  size_t len = FormatFixedTo(buf, value, decimals);
+  double out = 0;
+  std::from_chars(buf, buf + len, out);
+  return out;
 }
 
 std::string FormatFixed(double value, int decimals) {

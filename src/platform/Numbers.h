@@ -17,6 +17,11 @@ std::optional<double> ToNumber(std::string_view text);
 // zero, a minus sign for negatives and no digit grouping; never "-0.00".
 std::string FormatFixed(double value, int decimals);
 void AppendFixed(std::string& out, double value, int decimals);
+// The same text into a buffer of at least 400 characters; returns its length.
+size_t FormatFixedTo(char* buffer, double value, int decimals);
+
+// The value of FormatFixed(value, decimals) read back as a double.
+double RoundToDecimals(double value, int decimals);
 
 // The shortest text that reads back as the same double, without exponent
 // (an exponent form is expanded into leading or trailing zeros).

@@ -23,6 +23,13 @@ class LineNoteUi : public Ui {
   void viewText(const std::string& path, const std::string& typeDescription) override {
     inner_.viewText(path, typeDescription);
   }
+  bool openEditor(const std::string& path, const std::string& typeDescription,
+                  EditorMode mode) override {
+    return inner_.openEditor(path, typeDescription, mode);
+  }
+  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override {
+    return inner_.chooseFile(spec);
+  }
 
  private:
   Ui& inner_;

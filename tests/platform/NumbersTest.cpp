@@ -1,5 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <charconv>
+#include <cmath>
+#include <random>
+
 #include "platform/Numbers.h"
 
 namespace zv {
@@ -39,6 +43,44 @@ TEST(NumbersTest, PlainDecimalExpandsExponents) {
   EXPECT_EQ(FormatPlainDecimal(1e21), "1000000000000000000000");
   EXPECT_EQ(FormatPlainDecimal(-0.0), "0");
   EXPECT_EQ(FormatPlainDecimal(12.5), "12.5");
+}
+
+}  // namespace
+}  // namespace zv
+
+namespace zv {
+namespace {
+
+// The fast fixed formatting must give the text of the exact decimal expansion.
+TEST(NumbersTest, FastFixedMatchesExactRoundingIncludingTies) {
+  std::mt19937_64 rng(12345);
+  std::uniform_real_distribution<double> any(-1e7, 1e7);
+  std::uniform_int_distribution<int> places(0, 9);
+  auto exact = [](double v, int d) {
+    char buf[400];
+    auto res = std::to_chars(buf, buf + sizeof buf, v, std::chars_format::fixed, d);
+    std::string text(buf, res.ptr);
+    if (text.front() == '-' && text.find_first_of("123456789") == std::string::npos) {
+      text.erase(0, 1);
+    }
+    return text;
+  };
+  for (int i = 0; i < 200000; ++i) {
+    double v = any(rng);
+    int d = places(rng);
+    ASSERT_EQ(FormatFixed(v, d), exact(v, d)) << v << " " << d;
+    // Values on or next to a decimal tie of the last place.
+    double tie = std::round(v * 1e3) / 1e3 + 0.0005;
+    ASSERT_EQ(FormatFixed(tie, 3), exact(tie, 3)) << tie;
+    ASSERT_EQ(FormatFixed(std::nextafter(tie, 0.0), 3), exact(std::nextafter(tie, 0.0), 3));
+    double back = 0;
+    std::string text = exact(v, d);
+    std::from_chars(text.data(), text.data() + text.size(), back);
+    ASSERT_EQ(RoundToDecimals(v, d), back) << v << " " << d;
+  }
+  EXPECT_EQ(FormatFixed(0.125, 2), exact(0.125, 2));
+  EXPECT_EQ(FormatFixed(2.5, 0), exact(2.5, 0));
+  EXPECT_EQ(FormatFixed(1e300, 2).size(), 304u);
 }
 
 }  // namespace
