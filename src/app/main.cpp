@@ -47,6 +47,11 @@ int main(int argc, char** argv) {
 #else
   zv::ConsoleUi ui(std::cin, std::cout, std::cerr);
   zv::AppContext ctx(ui, zv::ExecutableFolder());
-  return zv::RunProgram(ctx, text, nullptr, std::cout);
+  int status = zv::RunProgram(ctx, text, nullptr, std::cout);
+  // The run is over: end without freeing a work area of perhaps millions of
+  // points one by one.
+  std::cout.flush();
+  std::cerr.flush();
+  std::_Exit(status);
 #endif
 }

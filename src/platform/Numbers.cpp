@@ -73,6 +73,17 @@ constexpr double kPow10[] = {1e0,  1e1,  1e2,  1e3,  1e4,  1e5,  1e6,  1e7,  1e8
 // tie, or out of range, it answers false and the caller takes the exact path.
 bool ScaledRound(double value, int decimals, long long& rounded) {
   if (decimals < 0 || decimals > 22 || !std::isfinite(value)) return false;
+  // Below 2^36 a double product is off by at most 2^-17.
+  double quick = value * kPow10[decimals];
+  if (quick > -68719476736.0 && quick < 68719476736.0) {
+    double magnitude = std::fabs(quick);
+    double whole = std::floor(magnitude);
+    double fraction = magnitude - whole;
+    if (std::fabs(fraction - 0.5) < 2e-4) return false;
+    long long m = static_cast<long long>(whole) + (fraction > 0.5 ? 1 : 0);
+    rounded = quick < 0 ? -m : m;
+    return true;
+  }
   long double scaled = static_cast<long double>(value) * kPow10[decimals];
   long double magnitude = scaled < 0 ? -scaled : scaled;
   if (magnitude >= 1e15L) return false;

@@ -45,7 +45,12 @@ int RunWithChosenUi(int& argc, char** argv, const std::string& argumentText) {
           "Run a translation without it with -t|definition|input|output (see --help).");
       return 1;
     };
-    return RunProgram(ctx, argumentText, needsDisplay, std::cout);
+    int status = RunProgram(ctx, argumentText, needsDisplay, std::cout);
+    // The run is over: end without freeing a work area of perhaps millions of
+    // points one by one.
+    std::cout.flush();
+    std::cerr.flush();
+    std::_Exit(status);
   }
   QApplication app(argc, argv);
   QApplication::setApplicationName(kAppTitle);
