@@ -530,17 +530,8 @@ bool ReadSrvFileStream(Ui& ui, WorkArea& work, std::istream& in, const std::stri
 }
 
 bool ReadSrvFile(Ui& ui, WorkArea& work, const std::string& path) {
-  if (!FileExists(path)) {
-    ui.message("The file '" + path + "' can not be found.", Icon::Exclamation, Buttons::Ok,
-               "File Not Found");
-    return false;
-  }
-  std::ifstream in(path, std::ios::binary);
-  if (!in) {
-    ui.message("The file '" + path + "' could not be opened.", Icon::Exclamation, Buttons::Ok,
-               kAppTitle);
-    return false;
-  }
+  std::ifstream in;
+  if (!OpenSurveyInput(ui, path, in)) return false;
   return ReadSrvFileStream(ui, work, in, path);
 }
 

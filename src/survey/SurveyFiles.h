@@ -3,6 +3,7 @@
 // side of the work area only when it succeeds; a writer writes the output
 // side. Both show their own messages and return true on success.
 
+#include <fstream>
 #include <istream>
 #include <string>
 
@@ -25,6 +26,10 @@ bool WriteProjectFile(Ui& ui, WorkArea& work, const std::string& path);
 bool ReadControlStream(Ui& ui, WorkArea& work, std::istream& in, const std::string& path);
 bool ReadPointsChainsStream(Ui& ui, WorkArea& work, std::istream& in, const std::string& path);
 bool ReadProjectStream(Ui& ui, WorkArea& work, std::istream& in, const std::string& path);
+
+// Opens an input file; a missing file shows "File Not Found", one that cannot
+// be opened "File Not Read". False after either message.
+bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in);
 
 // The message a writer shows when its output cannot be written.
 void ReportWriteFailure(Ui& ui, const std::string& path, const std::string& reason);

@@ -603,17 +603,23 @@ bool ReadTaggedStream(Ui& ui, WorkArea& work, std::istream& in, const std::strin
   return true;
 }
 
-bool ReadTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const TaggedFormat& format) {
+bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in) {
   if (!FileExists(path)) {
     ui.message("The file '" + path + "' can not be found.", Icon::Exclamation, Buttons::Ok,
                "File Not Found");
     return false;
   }
-  std::ifstream in(path, std::ios::binary);
+  in.open(path, std::ios::binary);
   if (!in) {
     ReportReadFailure(ui, path, std::strerror(errno));
     return false;
   }
+  return true;
+}
+
+bool ReadTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const TaggedFormat& format) {
+  std::ifstream in;
+  if (!OpenSurveyInput(ui, path, in)) return false;
   std::error_code ec;
   std::uintmax_t size = std::filesystem::file_size(path, ec);
   return ReadTaggedStream(ui, work, in, path, format, ec ? 0 : size);
