@@ -112,9 +112,9 @@ bool ConsoleUi::openEditor(const std::string& path, const std::string& typeDescr
   return false;
 }
 
-std::optional<std::string> ConsoleUi::chooseFile(const FileDialogSpec& spec) {
-  message("The file dialog \"" + spec.title + "\" needs a display.", Icon::Exclamation, Buttons::Ok,
-          kAppTitle);
+std::optional<std::string> ConsoleUi::chooseFile(const FileDialogRequest& request) {
+  message("The file dialog \"" + request.title + "\" needs a display.", Icon::Exclamation,
+          Buttons::Ok, kAppTitle);
   return std::nullopt;
 }
 

@@ -22,7 +22,7 @@ class ConsoleUi : public Ui {
   bool openEditor(const std::string& path, const std::string& typeDescription,
                   EditorMode mode) override;
   // Reports that a file dialog needs a display; always nullopt.
-  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override;
+  std::optional<std::string> chooseFile(const FileDialogRequest& request) override;
 
  private:
   std::istream& in_;

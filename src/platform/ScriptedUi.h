@@ -48,8 +48,8 @@ class ScriptedUi : public Ui {
                       typeDescription + ": " + path);
     return true;
   }
-  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override {
-    fileDialogs.push_back(spec);
+  std::optional<std::string> chooseFile(const FileDialogRequest& request) override {
+    fileDialogs.push_back(request);
     if (files.empty()) return std::nullopt;
     std::optional<std::string> a = files.front();
     files.pop_front();
@@ -68,7 +68,7 @@ class ScriptedUi : public Ui {
   std::vector<std::string> inputPrompts;
   std::vector<std::string> viewed;
   std::vector<std::string> editors;  // "viewer|editor: type: path"
-  std::vector<FileDialogSpec> fileDialogs;
+  std::vector<FileDialogRequest> fileDialogs;
   std::deque<std::optional<std::string>> files;  // answers to file dialogs
 };
 

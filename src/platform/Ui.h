@@ -17,7 +17,7 @@ enum class EditorMode { Viewer, Editor };
 
 // A common open or save file dialog. The filter is "description|pattern"
 // pairs joined by "|", e.g. "VORN Control Files (*.CTL)|*.CTL".
-struct FileDialogSpec {
+struct FileDialogRequest {
   FileDialogKind kind = FileDialogKind::Open;
   std::string title;
   std::string filter;
@@ -45,8 +45,8 @@ class Ui {
     return false;
   }
   // The chosen file's path; nullopt when cancelled or not possible.
-  virtual std::optional<std::string> chooseFile(const FileDialogSpec& spec) {
-    (void)spec;
+  virtual std::optional<std::string> chooseFile(const FileDialogRequest& request) {
+    (void)request;
     return std::nullopt;
   }
   // Busy pointer on or off.

@@ -286,12 +286,7 @@ bool FlexIn(Ui& ui, WorkArea& work, const std::string& appFolder, const std::str
     format = *choices.format;
   } else {
     FlexStore store = FlexStore::Input(appFolder);
-    if (!store.hasFormat(choices.formatName)) {
-      ui.exclaim(
-          "The format '" + choices.formatName + "' can not be found in '" + store.path() + "'.",
-          "Format Not Found");
-      return false;
-    }
+    if (!store.checkFormat(ui, choices.formatName)) return false;
     format = store.loadInput(choices.formatName);
   }
   if (!FileExists(path)) {

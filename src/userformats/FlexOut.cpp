@@ -264,12 +264,7 @@ bool FlexOut(Ui& ui, WorkArea& work, const std::string& appFolder, const std::st
     format = *choices.format;
   } else {
     FlexStore store = FlexStore::Output(appFolder);
-    if (!store.hasFormat(choices.formatName)) {
-      ui.exclaim(
-          "The format '" + choices.formatName + "' can not be found in '" + store.path() + "'.",
-          "Format Not Found");
-      return false;
-    }
+    if (!store.checkFormat(ui, choices.formatName)) return false;
     format = store.loadOutput(choices.formatName);
   }
   std::vector<FlexOutColumn> columns;

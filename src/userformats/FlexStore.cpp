@@ -128,6 +128,12 @@ std::vector<std::string> FlexStore::listFormats() const {
   return ReadProfileSections(path_);
 }
 
+bool FlexStore::checkFormat(Ui& ui, const std::string& name) const {
+  if (hasFormat(name)) return true;
+  ui.exclaim("The format '" + name + "' can not be found in '" + path_ + "'.", "Format Not Found");
+  return false;
+}
+
 bool FlexStore::hasFormat(const std::string& name) const {
   for (const auto& section : listFormats()) {
     if (section.size() != name.size()) continue;

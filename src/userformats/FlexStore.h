@@ -7,6 +7,8 @@
 #include <string_view>
 #include <vector>
 
+#include "platform/Ui.h"
+
 namespace zv {
 
 inline constexpr const char* kFlexInStoreName = "flexin.ini";
@@ -94,6 +96,8 @@ class FlexStore {
   std::vector<std::string> listFormats() const;
   // True when a format of that name (letter case aside) exists.
   bool hasFormat(const std::string& name) const;
+  // hasFormat, with a "Format Not Found" message when it is false.
+  bool checkFormat(Ui& ui, const std::string& name) const;
   // The stored value, or the default when missing or empty.
   std::string readValue(const std::string& format, const std::string& key,
                         const std::string& defaultValue = "") const;

@@ -27,8 +27,8 @@ class LineNoteUi : public Ui {
                   EditorMode mode) override {
     return inner_.openEditor(path, typeDescription, mode);
   }
-  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override {
-    return inner_.chooseFile(spec);
+  std::optional<std::string> chooseFile(const FileDialogRequest& request) override {
+    return inner_.chooseFile(request);
   }
 
  private:

@@ -191,13 +191,13 @@ bool QtUi::openEditor(const std::string& path, const std::string& typeDescriptio
   });
 }
 
-std::optional<std::string> QtUi::chooseFile(const FileDialogSpec& spec) {
+std::optional<std::string> QtUi::chooseFile(const FileDialogRequest& request) {
   return OnGuiThread([&]() -> std::optional<std::string> {
     PointerPause pause(busy_);
-    QFileDialog dialog(Owner(), QString::fromStdString(spec.title),
-                       QString::fromStdString(spec.folder));
-    dialog.setNameFilters(QtNameFilters(spec.filter));
-    if (spec.kind == FileDialogKind::Open) {
+    QFileDialog dialog(Owner(), QString::fromStdString(request.title),
+                       QString::fromStdString(request.folder));
+    dialog.setNameFilters(QtNameFilters(request.filter));
+    if (request.kind == FileDialogKind::Open) {
       dialog.setAcceptMode(QFileDialog::AcceptOpen);
       dialog.setFileMode(QFileDialog::ExistingFile);
     } else {

@@ -19,7 +19,7 @@ class QtUi : public Ui {
   void viewText(const std::string& path, const std::string& typeDescription) override;
   bool openEditor(const std::string& path, const std::string& typeDescription,
                   EditorMode mode) override;
-  std::optional<std::string> chooseFile(const FileDialogSpec& spec) override;
+  std::optional<std::string> chooseFile(const FileDialogRequest& request) override;
   void setBusy(bool on) override;
   bool hasWindows() const override { return true; }
 
