@@ -24,6 +24,8 @@ TEST(QtUiTest, NameFiltersMatchEitherLetterCase) {
   EXPECT_EQ(QtNameFilters("User-Defined ASCII Files (*.*)|*.*|Out File (*.OUT)|*.OUT"),
             (QStringList{"User-Defined ASCII Files (*)", "Out File (*.OUT *.out)"}));
   EXPECT_EQ(QtNameFilters("Available Point Numbers|"), QStringList{"Available Point Numbers (*)"});
+  EXPECT_EQ(FilterSuffix("VORN Control Files (*.CTL *.ctl)"), "CTL");
+  EXPECT_EQ(FilterSuffix("User-Defined ASCII Files (*)"), "");
 }
 
 TEST(QtUiTest, UnattendedRunsUseQtOnlyWithADisplay) {
@@ -110,6 +112,39 @@ TEST(QtUiTest, LongWorkKeepsTheWindowsAliveAndShowsProgress) {
   EXPECT_THROW(RunInBackground(nullptr, "Translating...",
                                []() -> bool { throw std::runtime_error("disk full"); }),
                std::runtime_error);
+}
+
+// A question asked in the first moments of a run stays in front: the busy
+// window neither covers it nor blocks it, and comes back after the answer.
+TEST(QtUiTest, BusyWindowStepsAsideForAQuestion) {
+  QtUi ui;
+  auto busyShown = [] {
+    for (QWidget* w : QApplication::topLevelWidgets())
+      if (qobject_cast<BusyProgress*>(w) && w->isVisible()) return true;
+    return false;
+  };
+  bool coveredWhileAsking = false, shownAfterwards = false;
+  int polls = 0;
+  QTimer poll;
+  QObject::connect(&poll, &QTimer::timeout, [&] {
+    auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
+    if (box) {
+      coveredWhileAsking = coveredWhileAsking || busyShown();
+      if (++polls == 40) box->button(QMessageBox::Yes)->click();  // after 800 ms
+    } else if (polls >= 40) {
+      shownAfterwards = shownAfterwards || busyShown();
+    }
+  });
+  poll.start(20);
+  Answer answer = Answer::No;
+  RunInBackground(nullptr, "Translating...", [&] {
+    answer = ui.message("Overwrite it?", Icon::Question, Buttons::YesNo, "");
+    std::this_thread::sleep_for(std::chrono::milliseconds(900));
+    return true;
+  });
+  EXPECT_EQ(answer, Answer::Yes);
+  EXPECT_FALSE(coveredWhileAsking);
+  EXPECT_TRUE(shownAfterwards);
 }
 
 }  // namespace

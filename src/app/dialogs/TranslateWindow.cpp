@@ -61,7 +61,7 @@ TranslateWindow::TranslateWindow(AppContext& ctx, QWidget* parent)
   // A frame with its type list and a location group below it.
   auto frame = [&](const char* name, const QString& title, QComboBox*& list, const char* listName,
                    Group& group, const char* label, const char* text, const QString& caption,
-                   const char* browse) {
+                   const char* browse, const QString& browseText, const QString& typeCaption) {
     auto* box = new QGroupBox(title, page);
     box->setObjectName(name);
     list = MakeList(box, listName);
@@ -71,9 +71,11 @@ TranslateWindow::TranslateWindow(AppContext& ctx, QWidget* parent)
     group.text->setObjectName(text);
     group.text->setMinimumWidth(360);
     group.label->setBuddy(group.text);
-    group.buttons = {MakeButton(box, browse, "Browse...")};
+    group.buttons = {MakeButton(box, browse, browseText)};
     auto* grid = new QGridLayout(box);
-    grid->addWidget(new QLabel("Type:", box), 0, 0);
+    auto* typeLabel = new QLabel(typeCaption, box);
+    typeLabel->setBuddy(list);
+    grid->addWidget(typeLabel, 0, 0);
     grid->addWidget(list, 0, 1, 1, 2);
     grid->addWidget(group.label, 1, 0);
     grid->addWidget(group.text, 1, 1);
@@ -83,16 +85,16 @@ TranslateWindow::TranslateWindow(AppContext& ctx, QWidget* parent)
     return std::make_pair(box, grid);
   };
   frame("fraInput", "Input", inputType_, "cmbInputType", input_, "lblInputLocation",
-        "txtInputLocation", "File:", "cmdInputBrowse");
+        "txtInputLocation", "&File:", "cmdInputBrowse", "&Browse...", "&Input type:");
   frame("fraOutput", "Output", outputType_, "cmbOutputType", output_, "lblOutputLocation",
-        "txtOutputLocation", "File:", "cmdOutputBrowse");
+        "txtOutputLocation", "Fi&le:", "cmdOutputBrowse", "Brow&se...", "O&utput type:");
   auto [actionBox, actionGrid] =
       frame("fraAction", "Action", action_, "cmbAction", configuration_, "lblActionLocation",
-            "txtActionLocation", "Configuration:", "cmdActionBrowse");
-  default_ = new QCheckBox("Store as the action's default", actionBox);
+            "txtActionLocation", "&Configuration:", "cmdActionBrowse", "B&rowse...", "&Action:");
+  default_ = new QCheckBox("Store as the action's &default", actionBox);
   default_->setObjectName("chkActionDefault");
-  QPushButton* newButton = MakeButton(actionBox, "cmdActionNew", "New...");
-  QPushButton* editButton = MakeButton(actionBox, "cmdActionEdit", "Edit...");
+  QPushButton* newButton = MakeButton(actionBox, "cmdActionNew", "&New...");
+  QPushButton* editButton = MakeButton(actionBox, "cmdActionEdit", "&Edit...");
   configuration_.buttons.insert(configuration_.buttons.end(), {newButton, editButton, default_});
   auto* row = new QHBoxLayout;
   row->addWidget(default_);

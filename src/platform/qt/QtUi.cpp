@@ -3,6 +3,8 @@
 #include <QApplication>
 #include <QEventLoop>
 #include <QFileDialog>
+#include <QFontMetrics>
+#include <QGridLayout>
 #include <QInputDialog>
 #include <QMessageBox>
 #include <QPointer>
@@ -11,6 +13,7 @@
 #include <type_traits>
 
 #include "editor/TextEditorWindow.h"
+#include "platform/qt/BackgroundRun.h"
 
 namespace zv {
 
@@ -31,11 +34,6 @@ auto OnGuiThread(F&& f) -> std::invoke_result_t<F> {
   }
 }
 
-QWidget* Owner() {
-  if (QWidget* modal = QApplication::activeModalWidget()) return modal;
-  return QApplication::activeWindow();
-}
-
 QString Title(const std::string& title) {
   return QString::fromStdString(title.empty() ? std::string(kAppTitle) : title);
 }
@@ -46,19 +44,37 @@ QString Text(const std::string& text) {
   return s;
 }
 
-// The normal pointer while a window waits for an answer.
-class PointerPause {
+// While a window waits for an answer: the normal pointer, and no busy
+// window over it.
+class WaitForUser {
  public:
-  explicit PointerPause(bool busy) : busy_(busy) {
+  explicit WaitForUser(bool busy) : busy_(busy) {
     if (busy_) QApplication::restoreOverrideCursor();
   }
-  ~PointerPause() {
+  ~WaitForUser() {
     if (busy_) QApplication::setOverrideCursor(Qt::WaitCursor);
   }
+  WaitForUser(const WaitForUser&) = delete;
+  WaitForUser& operator=(const WaitForUser&) = delete;
+  QWidget* owner() const { return busyPause_.owner(); }
 
  private:
   bool busy_;
+  BusyPause busyPause_;
 };
+
+// A message box is as wide as its text; a short text would cut its title
+// ("Conversion Complete") in the title bar.
+void KeepTitleWhole(QMessageBox& box) {
+  constexpr int kTitleBarButtons = 160;
+  const int width =
+      QFontMetrics(QApplication::font("QWorkspaceTitleBar")).horizontalAdvance(box.windowTitle()) +
+      kTitleBarButtons;
+  if (auto* grid = qobject_cast<QGridLayout*>(box.layout())) {
+    grid->addItem(new QSpacerItem(width, 0, QSizePolicy::Minimum, QSizePolicy::Expanding),
+                  grid->rowCount(), 0, 1, grid->columnCount());
+  }
+}
 
 TextEditorWindow* NewEditor(Ui& ui, const std::string& path, const std::string& type,
                             EditorMode mode) {
@@ -100,11 +116,19 @@ QStringList QtNameFilters(const std::string& filter) {
   return filters;
 }
 
+QString FilterSuffix(const QString& nameFilter) {
+  static const QRegularExpression kFirstPattern(R"(\(\*\.([^ *?)]+)[ )])");
+  const QRegularExpressionMatch match = kFirstPattern.match(nameFilter);
+  return match.hasMatch() ? match.captured(1) : QString();
+}
+
 Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
                      const std::string& title) {
   return OnGuiThread([&] {
-    QMessageBox box(Owner());
+    WaitForUser wait(busy_);
+    QMessageBox box(wait.owner());
     box.setWindowTitle(Title(title));
+    KeepTitleWhole(box);
     box.setTextFormat(Qt::PlainText);
     box.setText(Text(text));
     switch (icon) {
@@ -143,7 +167,6 @@ Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
         box.setEscapeButton(QMessageBox::Cancel);
         break;
     }
-    PointerPause pause(busy_);
     switch (box.exec()) {
       case QMessageBox::Yes:
         return Answer::Yes;
@@ -163,10 +186,11 @@ Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
 std::optional<std::string> QtUi::input(const std::string& prompt, const std::string& title,
                                        const std::string& defaultText) {
   return OnGuiThread([&]() -> std::optional<std::string> {
-    PointerPause pause(busy_);
+    WaitForUser wait(busy_);
     bool ok = false;
-    QString answer = QInputDialog::getText(Owner(), Title(title), Text(prompt), QLineEdit::Normal,
-                                           QString::fromStdString(defaultText), &ok);
+    QString answer =
+        QInputDialog::getText(wait.owner(), Title(title), Text(prompt), QLineEdit::Normal,
+                              QString::fromStdString(defaultText), &ok);
     if (!ok) return std::nullopt;
     return answer.toStdString();
   });
@@ -174,7 +198,7 @@ std::optional<std::string> QtUi::input(const std::string& prompt, const std::str
 
 void QtUi::viewText(const std::string& path, const std::string& typeDescription) {
   OnGuiThread([&] {
-    PointerPause pause(busy_);
+    WaitForUser wait(busy_);
     QPointer<TextEditorWindow> viewer = NewEditor(*this, path, typeDescription, EditorMode::Viewer);
     // Wait for the viewer to close while every window keeps working.
     QEventLoop loop;
@@ -193,8 +217,8 @@ bool QtUi::openEditor(const std::string& path, const std::string& typeDescriptio
 
 std::optional<std::string> QtUi::chooseFile(const FileDialogRequest& request) {
   return OnGuiThread([&]() -> std::optional<std::string> {
-    PointerPause pause(busy_);
-    QFileDialog dialog(Owner(), QString::fromStdString(request.title),
+    WaitForUser wait(busy_);
+    QFileDialog dialog(wait.owner(), QString::fromStdString(request.title),
                        QString::fromStdString(request.folder));
     dialog.setNameFilters(QtNameFilters(request.filter));
     if (request.kind == FileDialogKind::Open) {
@@ -203,6 +227,12 @@ std::optional<std::string> QtUi::chooseFile(const FileDialogRequest& request) {
     } else {
       dialog.setAcceptMode(QFileDialog::AcceptSave);
       dialog.setFileMode(QFileDialog::AnyFile);
+      // A name without an extension gets the chosen type's.
+      auto useSuffixOf = [&dialog](const QString& nameFilter) {
+        dialog.setDefaultSuffix(FilterSuffix(nameFilter));
+      };
+      if (!dialog.nameFilters().isEmpty()) useSuffixOf(dialog.nameFilters().front());
+      QObject::connect(&dialog, &QFileDialog::filterSelected, &dialog, useSuffixOf);
     }
     if (dialog.exec() != QDialog::Accepted || dialog.selectedFiles().isEmpty()) {
       return std::nullopt;

@@ -31,4 +31,8 @@ class QtUi : public Ui {
 // without regard to letter case; "*.*" and a missing pattern match every file.
 QStringList QtNameFilters(const std::string& filter);
 
+// The extension of a name filter's first pattern ("CTL" of
+// "VORN Control Files (*.CTL *.ctl)"); empty when it matches every file.
+QString FilterSuffix(const QString& nameFilter);
+
 }  // namespace zv
