@@ -4,6 +4,7 @@
 #include <cctype>
 #include <filesystem>
 
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
@@ -118,8 +119,20 @@ bool Catalogue::updateDefaultConfiguration(const std::string& path) {
 
 std::string DefaultPath(const std::string& folder, const std::string& stem,
                         const std::string& typeName) {
-  std::string candidate = folder + stem + TypeExtension(typeName);
-  return FileExists(candidate) ? candidate : folder;
+  const std::string name = stem + TypeExtension(typeName);
+  if (FileExists(folder + name)) return folder + name;
+  // The stem as given; the extension in any letter case (JOB7.ctl).
+  namespace fs = std::filesystem;
+  std::error_code ec;
+  for (fs::directory_iterator it(folder.empty() ? "." : folder, ec), end; !ec && it != end;
+       it.increment(ec)) {
+    const std::string found = it->path().filename().string();
+    if (found.size() == name.size() && found.compare(0, stem.size(), stem) == 0 &&
+        EqualsNoCase(found.substr(stem.size()), name.substr(stem.size())) &&
+        it->is_regular_file(ec))
+      return folder + found;
+  }
+  return folder;
 }
 
 }  // namespace zv

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <cmath>
 #include <filesystem>
 
 #include "app/AppContext.h"
@@ -223,6 +224,12 @@ bool TranslateLogic::validate() {
   return true;
 }
 
+ConsolePlace ConsoleBelow(const WindowFrame& window) {
+  constexpr int kConsoleWidth = 640;
+  return {static_cast<int>(std::lround(window.left + window.width / 2.0)) - kConsoleWidth / 2,
+          window.top + window.height};
+}
+
 RoutineCall TranslateLogic::makeCall() const {
   RoutineCall call;
   call.inputPath = input.enabled ? Absolute(input.text) : std::string();
@@ -244,7 +251,8 @@ bool TranslateLogic::translate() {
   ctx_.ui.setBusy(true);
   bool done = false;
   if (const WindowRoutine* routine = FindWindowRoutine(program)) {
-    WindowRun run{ctx_, call, storeDefault && configuration.enabled, runLong_};
+    WindowRun run{ctx_, call, storeDefault && configuration.enabled, runLong_,
+                  frame_ ? ConsoleBelow(frame_()) : ConsolePlace{}};
     // An error raised below a routine ends the run here, where it is shown.
     try {
       done = routine->run(run);

@@ -4,6 +4,7 @@
 // OK in their order and the dispatch on the definition's Program. The window
 // binds its controls to this state and calls these operations.
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -29,6 +30,14 @@ struct ChoiceList {
   // without empty entries and without entries equal to an earlier one.
   void fill(const std::string& queryResult);
 };
+
+// Where a window stands on the screen, in pixels.
+struct WindowFrame {
+  int left = 0, top = 0, width = 0, height = 0;
+};
+
+// The 640-pixel-wide tool console, centred below the window.
+ConsolePlace ConsoleBelow(const WindowFrame& window);
 
 // A label, a path box and its buttons, enabled or disabled as a whole.
 struct LocationGroup {
@@ -68,6 +77,8 @@ class TranslateLogic {
 
   // How the long part of a routine runs (inline when not set).
   void setLongRunner(LongRunner runner) { runLong_ = std::move(runner); }
+  // Where the window stands, asked at every OK (for the tool console).
+  void setFrameSource(std::function<WindowFrame()> source) { frame_ = std::move(source); }
 
   ChoiceList inputTypes, outputTypes, actions;
   LocationGroup input, output, configuration;
@@ -80,6 +91,7 @@ class TranslateLogic {
 
   AppContext& ctx_;
   LongRunner runLong_;
+  std::function<WindowFrame()> frame_;
 };
 
 }  // namespace zv

@@ -44,7 +44,7 @@ bool RunReplace(WindowRun& run) {
 
 // The window has no console position of its own yet: tools open at 0, 0.
 ToolPlace PlaceOf(const WindowRun& run) {
-  return PintrelPlace(run.ctx.appFolder);
+  return PintrelPlace(run.ctx.appFolder, run.console.left, run.console.top);
 }
 
 // A tool's report in a viewer window, then deleted. A report no window

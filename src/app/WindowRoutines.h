@@ -18,11 +18,17 @@ struct AppContext;
 // its result. The window runs it on a worker thread with a progress window.
 using LongRunner = std::function<bool(const std::function<bool()>&)>;
 
+// The top left corner of the tool console window, in pixels.
+struct ConsolePlace {
+  int left = 0, top = 0;
+};
+
 struct WindowRun {
   AppContext& ctx;
   RoutineCall call;
   bool storeDefaultConfiguration = false;  // the "default" check box is ticked
   LongRunner runLong;
+  ConsolePlace console;
 };
 
 using WindowRoutineFn = bool (*)(WindowRun&);

@@ -57,7 +57,7 @@ QString EditorFilter(const QString& typeText) {
 
 bool HasListingViews(const QString& path) {
   static const QStringList kEndings = {"PRJ", "EDI", "CAL", "PAC", "CTL", "ALI"};
-  return kEndings.contains(path.right(3));
+  return kEndings.contains(path.right(3).toUpper());
 }
 
 TextEditorWindow::TextEditorWindow(Ui& ui, QWidget* parent) : QMainWindow(parent), ui_(ui) {

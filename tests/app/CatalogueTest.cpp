@@ -94,6 +94,10 @@ TEST(DefaultPathTest, ProposesStemWhenTheFileExists) {
   dir.write("JOB7.CTL", "AC:PR\r\n");
   EXPECT_EQ(DefaultPath(folder, "JOB7", kCtl), folder + "JOB7.CTL");
   EXPECT_EQ(DefaultPath(folder, "JOB7", "VORN Project Files (*.PRJ)"), folder);
+  dir.write("job8.pac", "AC:PR\r\n");
+  EXPECT_EQ(DefaultPath(folder, "job8", "VORN Points and Chains Files (*.PAC)"),
+            folder + "job8.pac");
+  EXPECT_EQ(DefaultPath(folder, "JOB8", "VORN Points and Chains Files (*.PAC)"), folder);
   EXPECT_EQ(TypeExtension("VORN Project Files (*.PRJ)"), ".PRJ");
 }
 

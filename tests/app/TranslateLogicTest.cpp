@@ -74,6 +74,12 @@ TEST(ChoiceListTest, FillDropsEmptyAndRepeatedEntriesKeepingFirstPositions) {
   EXPECT_TRUE(list.items.empty());
 }
 
+TEST(ConsoleBelowTest, CentresTheToolConsoleBelowTheWindow) {
+  const ConsolePlace place = ConsoleBelow({100, 50, 601, 400});
+  EXPECT_EQ(place.left, 81);  // 100 + 300.5 rounded, less half of 640
+  EXPECT_EQ(place.top, 450);
+}
+
 TEST_F(TranslateLogicTest, ListsCascadeFromTheCatalogue) {
   ASSERT_TRUE(logic.load());
   EXPECT_TRUE(ui.boxes.empty());
@@ -123,9 +129,9 @@ TEST_F(TranslateLogicTest, ManualEntryHasNoLocationAndSkipsTheFileChecks) {
 
 TEST_F(TranslateLogicTest, PresetsProposeFolderStemAndExtension) {
   ctx.startup.fileStem = "job";
-  // Letter case counts on this system: job.ctl is not job.CTL.
+  // The extension in either letter case; the exact spelling first.
   ASSERT_TRUE(logic.load());
-  EXPECT_EQ(logic.input.text, dir.file("data/"));
+  EXPECT_EQ(logic.input.text, dir.file("data/job.ctl"));
   dir.write("data/job.CTL", kControl);
   logic.selectInputType(0);
   EXPECT_EQ(logic.input.text, dir.file("data/job.CTL"));

@@ -54,7 +54,7 @@ class WindowRoutinesTest : public ::testing::Test {
       ADD_FAILURE() << program << " is not in the table";
       return false;
     }
-    WindowRun w{context, {}, false, {}};
+    WindowRun w{context, {}, false, {}, {}};
     w.call.inputPath = input;
     w.call.outputPath = output;
     w.call.configurationPath = configuration;

@@ -70,7 +70,7 @@ TEST_F(EditorTest, ViewerHidesTheEditingMenusAndShowsViewsForTaggedFiles) {
 
   // Endings compare with their letter case; other types have no views.
   EXPECT_TRUE(HasListingViews("/a/b.PRJ"));
-  EXPECT_FALSE(HasListingViews("/a/b.ctl"));
+  EXPECT_TRUE(HasListingViews("/a/b.ctl"));  // extensions in either case
   EXPECT_FALSE(HasListingViews("/a/b.OUT"));
   EXPECT_EQ(EditorFilter("Out File (*.OUT)"), "Out File (*.OUT)|*.OUT");
 

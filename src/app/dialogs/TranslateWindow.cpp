@@ -118,6 +118,10 @@ TranslateWindow::TranslateWindow(AppContext& ctx, QWidget* parent)
   logic_.setLongRunner([this](const std::function<bool()>& work) {
     return RunInBackground(this, "Translating...", work);
   });
+  logic_.setFrameSource([this] {
+    const QRect frame = frameGeometry();
+    return WindowFrame{frame.x(), frame.y(), frame.width(), frame.height()};
+  });
   bind();
   sync();
 }
