@@ -76,8 +76,7 @@ void ChoiceList::fill(const std::string& queryResult) {
 TranslateLogic::TranslateLogic(AppContext& ctx) : ctx_(ctx) {}
 
 std::string TranslateLogic::Caption() {
-  return std::string(kAppTitle) + " - " + std::to_string(kVersionMajor) + "." +
-         std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision);
+  return std::string(kAppTitle) + " - " + kVersionText;
 }
 
 bool TranslateLogic::load() {

@@ -38,8 +38,7 @@ int main(int argc, char** argv) {
     return 0;
   }
   if (text == "--version") {
-    std::cout << zv::kAppTitle << ' ' << zv::kVersionMajor << '.' << zv::kVersionMinor << '.'
-              << zv::kVersionRevision << '\n';
+    std::cout << zv::kTitleAndVersion << '\n';
     return 0;
   }
 #ifdef ZV_GUI
