@@ -1,6 +1,7 @@
 // libFuzzer target for the FlexIn reader. The first bytes choose the format
 // (delimiter, angle format, columns, position cells, prefixes); the rest is
 // the file. Any input must read or be refused with a message, never crash.
+// Seeds in tests/fixtures/flex/fuzz-seeds start with such a selector.
 
 #include <cstdint>
 #include <cstdlib>

@@ -1,6 +1,7 @@
 // libFuzzer target for the search-and-replace command parser and filter.
 // The input is a command file, a NUL byte, and the file to filter. Any input
-// must filter or be refused with a message, never crash or hang.
+// must filter or be refused with a message, never crash or hang. Seeds in
+// tests/fixtures/replace/fuzz-seeds hold both parts.
 
 #include <cstdint>
 #include <cstdlib>

@@ -1,10 +1,16 @@
 #include "app/Startup.h"
 
+#include <fcntl.h>
+#include <pwd.h>
 #include <sys/file.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cctype>
+#include <cerrno>
+#include <cinttypes>
+#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <functional>
@@ -62,22 +68,87 @@ std::string ArgumentText(int argc, char** argv) {
   return text;
 }
 
+namespace {
+
+// FNV-1a: the same name for the same folder in every run.
+std::string FolderKey(const std::string& folder) {
+  uint64_t h = 14695981039346656037ull;
+  for (unsigned char c : folder) h = (h ^ c) * 1099511628211ull;
+  char key[17];
+  std::snprintf(key, sizeof key, "%016" PRIx64, h);
+  return key;
+}
+
+// Opens folder as a private folder of the user: created with mode 0700 when
+// missing; refused when it is a link or belongs to someone else. Returns
+// the descriptor of the folder, or -1.
+int OpenPrivateFolder(const std::string& folder) {
+  ::mkdir(folder.c_str(), 0700);
+  int fd = ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC);
+  if (fd < 0) return -1;
+  struct stat st {};
+  if (::fstat(fd, &st) != 0 || !S_ISDIR(st.st_mode) || st.st_uid != ::getuid() ||
+      ((st.st_mode & 077) != 0 && ::fchmod(fd, 0700) != 0)) {
+    ::close(fd);
+    return -1;
+  }
+  return fd;
+}
+
+}  // namespace
+
+int OpenLockFolder() {
+  // Chosen by the user id alone, so that every run of one user finds the
+  // same lock whatever its environment.
+  const std::string uid = std::to_string(::getuid());
+  int fd = OpenPrivateFolder("/tmp/zurevazidu-" + uid);
+  if (fd >= 0) return fd;
+  // Someone else holds that name: a folder in the user's home instead.
+  const passwd* pw = ::getpwuid(::getuid());
+  if (!pw || !pw->pw_dir || !*pw->pw_dir) return -1;
+  std::error_code ec;
+  std::filesystem::create_directories(std::string(pw->pw_dir) + "/.cache", ec);
+  return OpenPrivateFolder(std::string(pw->pw_dir) + "/.cache/zurevazidu");
+}
+
 InstanceLock::InstanceLock(const std::string& appFolder) {
-  const char* runtime = std::getenv("XDG_RUNTIME_DIR");
-  std::string folder = runtime && *runtime ? runtime : "/tmp";
   std::error_code ec;
   std::string canonical = std::filesystem::weakly_canonical(appFolder, ec).string();
   if (ec) canonical = appFolder;
-  std::string name = folder + "/zurevazidu-" + std::to_string(getuid()) + "-" +
-                     std::to_string(std::hash<std::string>{}(canonical)) + ".lock";
-  fd_ = ::open(name.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
+  name_ = "instance-" + FolderKey(canonical) + ".lock";
+  folder_ = OpenLockFolder();
   // Without a lock file the guard cannot work; the program still runs.
-  if (fd_ < 0) return;
-  acquired_ = ::flock(fd_, LOCK_EX | LOCK_NB) == 0;
+  if (folder_ < 0) return;
+  for (int attempt = 0; attempt < 5; ++attempt) {
+    fd_ = ::openat(folder_, name_.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_CLOEXEC, 0600);
+    if (fd_ < 0) {
+      // Only this user can have put a link here: it is removed, not followed.
+      if (errno == ELOOP && ::unlinkat(folder_, name_.c_str(), 0) == 0) continue;
+      return;
+    }
+    if (::flock(fd_, LOCK_EX | LOCK_NB) != 0) {
+      acquired_ = false;
+      return;
+    }
+    // The holder before removes the file when it ends: the lock counts only
+    // while it is still on the file of that name.
+    struct stat held {
+    }, named{};
+    if (::fstat(fd_, &held) == 0 &&
+        ::fstatat(folder_, name_.c_str(), &named, AT_SYMLINK_NOFOLLOW) == 0 &&
+        held.st_dev == named.st_dev && held.st_ino == named.st_ino) {
+      owner_ = true;
+      return;
+    }
+    ::close(fd_);
+    fd_ = -1;
+  }
 }
 
 InstanceLock::~InstanceLock() {
+  if (owner_) ::unlinkat(folder_, name_.c_str(), 0);
   if (fd_ >= 0) ::close(fd_);
+  if (folder_ >= 0) ::close(folder_);
 }
 
 int RunProgram(AppContext& ctx, const std::string& argumentText, const WindowOpener& openWindow,

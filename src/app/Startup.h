@@ -27,6 +27,11 @@ bool ParseTruthValue(const std::string& text, bool& value);
 // argv[1..] joined by single blanks.
 std::string ArgumentText(int argc, char** argv);
 
+// The private folder of this user that holds the instance locks (mode 0700,
+// owned by the user, not a link): /tmp/zurevazidu-<uid>, or
+// ~/.cache/zurevazidu when that name is taken. A descriptor, or -1.
+int OpenLockFolder();
+
 // Holds the lock of one running instance per user and application folder.
 class InstanceLock {
  public:
@@ -38,7 +43,10 @@ class InstanceLock {
   bool acquired() const { return acquired_; }
 
  private:
+  std::string name_;
+  int folder_ = -1;
   int fd_ = -1;
+  bool owner_ = false;
   bool acquired_ = true;
 };
 

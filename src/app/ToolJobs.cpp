@@ -54,12 +54,31 @@ bool ToolPresent(Ui& ui, const ToolPlace& place, const ToolSpec& tool) {
   return false;
 }
 
-bool CreateEmptyOutput(Ui& ui, const std::string& output) {
+// The empty output file a tool is given; `created` tells whether this job
+// made it, so that a tool that never starts leaves nothing behind.
+bool CreateEmptyOutput(Ui& ui, const std::string& output, bool& created) {
+  created = false;
+  if (IsNonRegularFile(output)) {
+    ui.exclaim("The output file '" + output + "' can not be written.\r\n" + kNotRegularFile);
+    return false;
+  }
   if (FileExists(output)) return true;
   std::ofstream file(output, std::ios::binary);
-  if (file) return true;
+  if (file) {
+    created = true;
+    return true;
+  }
   ui.exclaim("The output file '" + output + "' could not be created.");
   return false;
+}
+
+// The configuration path as the tool needs it: absolute, since the tool runs
+// in its own folder, and without its extension.
+std::string ConfigurationStem(const std::string& configuration) {
+  if (configuration.empty()) return "";
+  std::error_code ec;
+  fs::path absolute = fs::absolute(configuration, ec);
+  return WithoutExtension(ec ? configuration : absolute.lexically_normal().string());
 }
 
 bool WriteJobFile(Ui& ui, const ToolPlace& place, const std::vector<std::string>& lines) {
@@ -69,13 +88,16 @@ bool WriteJobFile(Ui& ui, const ToolPlace& place, const std::vector<std::string>
   return false;
 }
 
-// Runs the tool in its job folder, waits, and removes the job file.
-bool RunTool(Ui& ui, const ToolPlace& place, const ToolSpec& tool) {
+// Runs the tool in its job folder, waits, and removes the job file. The
+// empty output made for a tool that does not start is removed as well.
+bool RunTool(Ui& ui, const ToolPlace& place, const ToolSpec& tool,
+             const std::string& madeOutput = "") {
   ConsoleWindow window{1, tool.title, place.left, place.top, 640, 125, 240};
   ProcessResult run = RunAndWait(ToolPath(place, tool), {}, place.jobFolder, window);
   std::error_code ec;
   fs::remove(JobPath(place), ec);
   if (!run.started) {
+    if (!madeOutput.empty()) fs::remove(madeOutput, ec);
     ui.exclaim("The program '" + ToolPath(place, tool) + "' could not be started: " + run.error,
                "Program Not Started");
     return false;
@@ -83,13 +105,21 @@ bool RunTool(Ui& ui, const ToolPlace& place, const ToolSpec& tool) {
   return true;
 }
 
+// Removes an empty output this job made; false.
+bool Unmake(const std::string& output, bool made) {
+  std::error_code ec;
+  if (made) fs::remove(output, ec);
+  return false;
+}
+
 // Tools that read the input and write the output with both paths in the
 // job file.
 bool TwoPathJob(Ui& ui, const ToolSpec& tool, const std::string& input, const std::string& output,
                 const ToolPlace& place) {
-  if (!ToolPresent(ui, place, tool) || !CreateEmptyOutput(ui, output)) return false;
-  if (!WriteJobFile(ui, place, {ShortPath(input), ShortPath(output)})) return false;
-  return RunTool(ui, place, tool);
+  bool made = false;
+  if (!ToolPresent(ui, place, tool) || !CreateEmptyOutput(ui, output, made)) return false;
+  if (!WriteJobFile(ui, place, {ShortPath(input), ShortPath(output)})) return Unmake(output, made);
+  return RunTool(ui, place, tool, made ? output : "");
 }
 
 }  // namespace
@@ -100,12 +130,13 @@ ToolPlace PintrelPlace(const std::string& appFolder, int left, int top) {
 
 bool ConvertToolJob(Ui& ui, const std::string& input, const std::string& output,
                     const std::string& configuration, const ToolPlace& place) {
-  if (!ToolPresent(ui, place, kConvert) || !CreateEmptyOutput(ui, output)) return false;
+  bool made = false;
+  if (!ToolPresent(ui, place, kConvert) || !CreateEmptyOutput(ui, output, made)) return false;
   if (!WriteJobFile(ui, place,
-                    {ShortPath(input), ShortPath(output), WithoutExtension(configuration)})) {
-    return false;
+                    {ShortPath(input), ShortPath(output), ConfigurationStem(configuration)})) {
+    return Unmake(output, made);
   }
-  return RunTool(ui, place, kConvert);
+  return RunTool(ui, place, kConvert, made ? output : "");
 }
 
 bool Pcpt2PiToolJob(Ui& ui, const std::string& input, const std::string& output,
@@ -120,13 +151,14 @@ bool Pi2PcptToolJob(Ui& ui, const std::string& input, const std::string& output,
 
 bool ExtractToolJob(Ui& ui, const std::string& input, const std::string& output,
                     const std::string& configuration, bool anyMatch, const ToolPlace& place) {
-  if (!ToolPresent(ui, place, kExtract) || !CreateEmptyOutput(ui, output)) return false;
+  bool made = false;
+  if (!ToolPresent(ui, place, kExtract) || !CreateEmptyOutput(ui, output, made)) return false;
   if (!WriteJobFile(ui, place,
-                    {ShortPath(input), ShortPath(output), WithoutExtension(configuration),
+                    {ShortPath(input), ShortPath(output), ConfigurationStem(configuration),
                      anyMatch ? "Y" : "N"})) {
-    return false;
+    return Unmake(output, made);
   }
-  return RunTool(ui, place, kExtract);
+  return RunTool(ui, place, kExtract, made ? output : "");
 }
 
 bool Ctl2AreToolJob(Ui& ui, const std::string& input, const std::string& output,
@@ -146,12 +178,19 @@ bool LlevToolJob(Ui& ui, const std::string& input, const std::string& output, do
   if (!WriteJobFile(ui, place, {shortInput, FormatPlainDecimal(upperLimit)})) return false;
   if (!RunTool(ui, place, kLlev)) return false;
 
-  // The tool writes its result next to the input, ending in "prj".
+  // The tool writes its result next to the input, ending in "prj". An input
+  // that already ends so is no result: it is never copied nor deleted.
   const std::string result =
       shortInput.size() >= 3 ? shortInput.substr(0, shortInput.size() - 3) + "prj" : "";
   std::error_code ec;
-  if (result.empty() || !fs::is_regular_file(result, ec)) {
+  if (result.empty() || result == shortInput || fs::equivalent(result, input, ec) ||
+      !fs::is_regular_file(result, ec)) {
     ui.exclaim("LLEV.EXE left no result file '" + result + "'.");
+    return false;
+  }
+  if (IsNonRegularFile(output)) {
+    ui.exclaim("The result of LLEV.EXE could not be copied to '" + output + "'.\r\n" +
+               kNotRegularFile);
     return false;
   }
   // An output path naming the result itself keeps it.
@@ -174,7 +213,8 @@ bool SortToolJob(Ui& ui, const std::string& input, const std::string& output,
 
 bool LocalGridToLocalJob(Ui& ui, const std::string& input, const std::string& output, short mode,
                          const std::string& modeText, const ToolPlace& place) {
-  if (!ToolPresent(ui, place, kLocal) || !CreateEmptyOutput(ui, output)) return false;
+  bool made = false;
+  if (!ToolPresent(ui, place, kLocal) || !CreateEmptyOutput(ui, output, made)) return false;
   return WriteJobFile(
       ui, place,
       {ShortPath(input), WithoutExtension(ShortPath(output)), std::to_string(mode), modeText});
@@ -183,7 +223,8 @@ bool LocalGridToLocalJob(Ui& ui, const std::string& input, const std::string& ou
 bool LocalLocalToGridJob(Ui& ui, const std::string& input, const std::string& output,
                          const std::string& text1, const std::string& text2,
                          const std::string& text3, const ToolPlace& place) {
-  if (!ToolPresent(ui, place, kLocal) || !CreateEmptyOutput(ui, output)) return false;
+  bool made = false;
+  if (!ToolPresent(ui, place, kLocal) || !CreateEmptyOutput(ui, output, made)) return false;
   return WriteJobFile(ui, place,
                       {ShortPath(input), WithoutExtension(ShortPath(output)), text1, text2, text3});
 }
@@ -263,6 +304,10 @@ bool SortToolRoutine(AppContext& ctx, const RoutineCall& call) {
 }
 
 bool CoordConvertRoutine(AppContext& ctx, const RoutineCall&) {
+  // An answer left by an earlier run, perhaps one that was killed, must not
+  // pass for the answer of this one.
+  std::error_code ec;
+  fs::remove(ctx.appPath(kExchangeOutput), ec);
   // The manual mode needs the Coordinate Conversion window, which this
   // routine does not have.
   ConversionState state;

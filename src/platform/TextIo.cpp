@@ -1,18 +1,59 @@
 #include "platform/TextIo.h"
 
+#include <dirent.h>
+#include <signal.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <atomic>
 #include <cerrno>
+#include <cinttypes>
+#include <climits>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <random>
+#include <iterator>
+#include <mutex>
+#include <sstream>
 
 namespace zv {
 
+namespace fs = std::filesystem;
+
 bool FileExists(const std::string& path) {
   std::error_code ec;
-  return !path.empty() && std::filesystem::is_regular_file(path, ec);
+  return !path.empty() && fs::is_regular_file(path, ec);
+}
+
+bool IsNonRegularFile(const std::string& path) {
+  struct stat st {};
+  return !path.empty() && ::stat(path.c_str(), &st) == 0 && !S_ISREG(st.st_mode);
+}
+
+bool LooksLikeUtf16(std::string_view head) {
+  if (head.starts_with("\xFF\xFE") || head.starts_with("\xFE\xFF")) return true;
+  // Latin text in UTF-16 has a NUL in every other byte; binary data has NULs
+  // in both positions.
+  const size_t pairs = std::min<size_t>(head.size(), 4096) / 2;
+  size_t nul[2] = {0, 0};
+  for (size_t i = 0; i < pairs * 2; ++i)
+    if (head[i] == '\0') ++nul[i & 1];
+  const size_t major = std::max(nul[0], nul[1]);
+  const size_t minor = std::min(nul[0], nul[1]);
+  return pairs > 0 && major * 2 >= pairs && minor * 16 <= major;
+}
+
+bool IsUtf16File(const std::string& path) {
+  std::ifstream in(path, std::ios::binary);
+  char head[4096];
+  in.read(head, sizeof head);
+  return LooksLikeUtf16(std::string_view(head, static_cast<size_t>(in.gcount())));
+}
+
+std::string Utf16Refusal(const std::string& path) {
+  return "The file '" + path +
+         "' is UTF-16 text, which can not be read.  Save it as UTF-8 or ANSI text.";
 }
 
 LineReader::LineReader(std::istream& in) : in_(in) {}
@@ -23,6 +64,7 @@ bool LineReader::fill() {
     buf_.erase(0, pos_);
     pos_ = 0;
   }
+  nextCr_ = nextLf_ = std::string::npos;
   const size_t chunk = chunk_;
   chunk_ = 1 << 20;  // small inputs get a small buffer, long files 1 MiB chunks
   size_t old = buf_.size();
@@ -34,21 +76,44 @@ bool LineReader::fill() {
   return got > 0;
 }
 
+void LineReader::start() {
+  started_ = true;
+  fill();
+  utf16_ = LooksLikeUtf16(buf_);
+  if (std::string_view(buf_).starts_with("\xEF\xBB\xBF")) pos_ = 3;
+}
+
+bool LineReader::isUtf16() {
+  if (!started_) start();
+  return utf16_;
+}
+
+size_t LineReader::find(char c, size_t& cached) const {
+  if (cached == std::string::npos || cached < pos_) {
+    const void* hit = std::memchr(buf_.data() + pos_, c, buf_.size() - pos_);
+    cached = hit ? static_cast<size_t>(static_cast<const char*>(hit) - buf_.data()) : buf_.size();
+  }
+  return cached;
+}
+
 bool LineReader::next(std::string_view& line) {
+  if (!started_) start();
   for (;;) {
-    size_t nl = buf_.find('\n', pos_);
-    if (nl != std::string::npos) {
-      size_t end = nl;
-      if (end > pos_ && buf_[end - 1] == '\r') --end;
+    const size_t cr = find('\r', nextCr_);
+    const size_t lf = cr == pos_ ? cr : find('\n', nextLf_);
+    const size_t end = std::min(cr, lf);
+    // A CR at the end of the buffer may be the first half of a CR LF.
+    const bool complete = end < buf_.size() && (end + 1 < buf_.size() || buf_[end] == '\n' || eof_);
+    if (complete) {
       line = std::string_view(buf_).substr(pos_, end - pos_);
-      pos_ = nl + 1;
+      pos_ = end + 1;
+      if (buf_[end] == '\r' && pos_ < buf_.size() && buf_[pos_] == '\n') ++pos_;
       return true;
     }
     if (!fill()) {
       if (pos_ >= buf_.size()) return false;
-      size_t end = buf_.size();
-      if (end > pos_ && buf_[end - 1] == '\r') --end;
-      line = std::string_view(buf_).substr(pos_, end - pos_);
+      line = std::string_view(buf_).substr(pos_);
+      if (line.ends_with('\r')) line.remove_suffix(1);
       pos_ = buf_.size();
       return true;
     }
@@ -64,24 +129,169 @@ bool ReadTextLines(const std::string& path, std::vector<std::string>& lines) {
   return true;
 }
 
+namespace {
+
+// Temporary files being written, for the signal handler: fixed buffers so
+// that the handler needs no allocation. State 0 free, 1 being filled, 2 live.
+struct TempSlot {
+  std::atomic<int> state{0};
+  char path[PATH_MAX];
+};
+constexpr int kTempSlots = 16;
+TempSlot g_tempSlots[kTempSlots];
+constexpr int kCleanupSignals[] = {SIGINT, SIGTERM, SIGHUP};
+
+extern "C" void RemoveTempsAndDie(int sig) {
+  for (TempSlot& slot : g_tempSlots)
+    if (slot.state.load() == 2) ::unlink(slot.path);
+  // The handler was reset to the default: the signal ends the process once
+  // this handler returns.
+  ::raise(sig);
+}
+
+// Only signals that would end the process anyway get the handler; one the
+// caller ignores or handles stays as it is.
+void InstallCleanupHandlers() {
+  static std::once_flag once;
+  std::call_once(once, [] {
+    struct sigaction action {};
+    action.sa_handler = RemoveTempsAndDie;
+    action.sa_flags = SA_RESETHAND;
+    sigemptyset(&action.sa_mask);
+    for (int sig : kCleanupSignals) sigaddset(&action.sa_mask, sig);
+    for (int sig : kCleanupSignals) {
+      struct sigaction old {};
+      if (::sigaction(sig, nullptr, &old) == 0 && !(old.sa_flags & SA_SIGINFO) &&
+          old.sa_handler == SIG_DFL) {
+        ::sigaction(sig, &action, nullptr);
+      }
+    }
+  });
+}
+
+int RegisterTemp(const std::string& path) {
+  if (path.size() >= PATH_MAX) return -1;
+  for (int i = 0; i < kTempSlots; ++i) {
+    int expected = 0;
+    if (g_tempSlots[i].state.compare_exchange_strong(expected, 1)) {
+      std::memcpy(g_tempSlots[i].path, path.c_str(), path.size() + 1);
+      g_tempSlots[i].state.store(2);
+      return i;
+    }
+  }
+  return -1;
+}
+
+void UnregisterTemp(int& slot) {
+  if (slot >= 0) g_tempSlots[slot].state.store(0);
+  slot = -1;
+}
+
+// FNV-1a: a hash that stays the same from run to run.
+uint64_t StableHash(std::string_view text) {
+  uint64_t h = 14695981039346656037ull;
+  for (unsigned char c : text) h = (h ^ c) * 1099511628211ull;
+  return h;
+}
+
+// Temporary files are named ".zv-<hash of the file name>-<pid>-<n>.tmp":
+// short whatever the length of the file name, and recognisable as those of
+// one output file and one process.
+std::string TempPrefix(const std::string& fileName) {
+  char prefix[32];
+  std::snprintf(prefix, sizeof prefix, ".zv-%016" PRIx64 "-", StableHash(fileName));
+  return prefix;
+}
+
+// Seconds since the epoch at which process pid started; 0 when unknown.
+double ProcessStartTime(long pid) {
+  static const double bootTime = [] {
+    std::ifstream stat("/proc/stat");
+    std::string key;
+    double value = 0;
+    while (stat >> key)
+      if (key == "btime" && stat >> value) return value;
+    return 0.0;
+  }();
+  char statPath[64];
+  std::snprintf(statPath, sizeof statPath, "/proc/%ld/stat", pid);
+  std::ifstream in(statPath);
+  std::string text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+  size_t close = text.rfind(')');
+  if (bootTime == 0 || close == std::string::npos) return 0;
+  // Field 22, the start time in clock ticks after boot; the text after the
+  // command name begins with field 3.
+  std::istringstream fields(text.substr(close + 1));
+  std::string field;
+  for (int i = 3; i < 22 && fields >> field; ++i) {
+  }
+  double ticks = 0;
+  if (!(fields >> ticks)) return 0;
+  return bootTime + ticks / static_cast<double>(::sysconf(_SC_CLK_TCK));
+}
+
+// A temporary file is stale when its process is gone, or when the process
+// with that number started after the file was last written (a reused pid).
+bool IsStaleTemp(const std::string& path, long pid) {
+  if (::kill(static_cast<pid_t>(pid), 0) != 0 && errno == ESRCH) return true;
+  struct stat st {};
+  if (::lstat(path.c_str(), &st) != 0) return false;
+  double started = ProcessStartTime(pid);
+  return started > 0 && static_cast<double>(st.st_mtime) + 2 < started;
+}
+
+void RemoveStaleTemps(const fs::path& folder, const std::string& prefix) {
+  const std::string dirName = folder.empty() ? "." : folder.string();
+  DIR* dir = ::opendir(dirName.c_str());
+  if (!dir) return;
+  while (const dirent* entry = ::readdir(dir)) {
+    std::string_view name = entry->d_name;
+    if (!name.starts_with(prefix) || !name.ends_with(".tmp")) continue;
+    long pid = 0;
+    unsigned n = 0;
+    char end = 0;
+    const std::string rest(name.substr(prefix.size()));
+    if (std::sscanf(rest.c_str(), "%ld-%u.tm%c", &pid, &n, &end) != 3 || pid <= 0) continue;
+    std::string path = dirName;
+    path += '/';
+    path += name;
+    if (IsStaleTemp(path, pid)) ::unlink(path.c_str());
+  }
+  ::closedir(dir);
+}
+
+}  // namespace
+
 TextFileWriter::TextFileWriter(std::string path) : path_(std::move(path)) {}
 
 TextFileWriter::~TextFileWriter() {
   if (file_) {
     std::fclose(file_);
     std::remove(tempPath_.c_str());
+    UnregisterTemp(slot_);
   }
 }
 
 bool TextFileWriter::open() {
-  std::filesystem::path target(path_);
-  std::filesystem::path folder = target.parent_path();
-  std::random_device rd;
+  if (IsNonRegularFile(path_)) {
+    error_ = kNotRegularFile;
+    return false;
+  }
+  InstallCleanupHandlers();
+  const fs::path target(path_);
+  const fs::path folder = target.parent_path();
+  const std::string prefix = TempPrefix(target.filename().string());
+  RemoveStaleTemps(folder, prefix);
+  static std::atomic<unsigned> counter{0};
   for (int attempt = 0; attempt < 5 && !file_; ++attempt) {
-    std::filesystem::path temp =
-        folder / ("." + target.filename().string() + "." + std::to_string(getpid()) + "." +
-                  std::to_string(rd() % 100000) + ".tmp");
-    tempPath_ = temp.string();
+    std::string name = prefix;
+    name += std::to_string(getpid());
+    name += '-';
+    name += std::to_string(counter++);
+    name += ".tmp";
+    std::error_code ec;
+    fs::path temp = fs::absolute(folder / name, ec);
+    tempPath_ = ec ? (folder / name).string() : temp.string();
     file_ = std::fopen(tempPath_.c_str(), "wbx");
     if (!file_ && errno != EEXIST) break;
   }
@@ -89,6 +299,7 @@ bool TextFileWriter::open() {
     error_ = std::strerror(errno);
     return false;
   }
+  slot_ = RegisterTemp(tempPath_);
   buf_.reserve(kFlushAt + 4096);
   return true;
 }
@@ -118,17 +329,23 @@ bool TextFileWriter::commit() {
     error_ = std::strerror(errno);
   }
   file_ = nullptr;
+  // Something put at the path while the file was written is not replaced.
+  if (ok && IsNonRegularFile(path_)) {
+    ok = false;
+    error_ = kNotRegularFile;
+  }
   if (ok) {
     // Keep the permissions of a file that is replaced.
     std::error_code ec;
-    auto perms = std::filesystem::status(path_, ec).permissions();
-    if (!ec) std::filesystem::permissions(tempPath_, perms, ec);
+    auto perms = fs::status(path_, ec).permissions();
+    if (!ec) fs::permissions(tempPath_, perms, ec);
     if (std::rename(tempPath_.c_str(), path_.c_str()) != 0) {
       ok = false;
       error_ = std::strerror(errno);
     }
   }
   if (!ok) std::remove(tempPath_.c_str());
+  UnregisterTemp(slot_);
   return ok;
 }
 

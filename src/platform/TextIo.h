@@ -1,7 +1,10 @@
 #pragma once
-// Line-based text I/O: lines end in LF or CR LF when read, CR LF when written.
-// Written files go to a temporary file in the same folder and are renamed
-// into place, so a failed write never leaves a half-written file.
+// Line-based text I/O: lines end in CR LF, LF or CR alone when read (a
+// leading UTF-8 byte-order mark is skipped), CR LF when written. Written
+// files go to a temporary file in the same folder and are renamed into place,
+// so a failed write never leaves a half-written file; the temporary file is
+// removed when the process is ended by SIGINT, SIGTERM or SIGHUP, and one
+// left by a killed run is removed by the next write of the same file.
 
 #include <cstdio>
 #include <istream>
@@ -13,6 +16,22 @@ namespace zv {
 
 bool FileExists(const std::string& path);
 
+// True when something other than a regular file (a device, a pipe, a socket,
+// a folder, or a link to one) exists at path.
+bool IsNonRegularFile(const std::string& path);
+// The reason a writer gives for such a path.
+inline constexpr const char* kNotRegularFile =
+    "It is not a regular file (a device, pipe, socket or folder) and is not replaced.";
+
+// True when text starting with `head` is UTF-16: a byte-order mark FF FE or
+// FE FF, or NUL bytes in every other position.
+bool LooksLikeUtf16(std::string_view head);
+// True when the file at path starts like UTF-16 text.
+bool IsUtf16File(const std::string& path);
+// The refusal of a UTF-16 file, naming it.
+std::string Utf16Refusal(const std::string& path);
+inline constexpr const char* kUtf16Title = "Unsupported Text Encoding";
+
 class LineReader {
  public:
   explicit LineReader(std::istream& in);
@@ -21,14 +40,24 @@ class LineReader {
   bool next(std::string_view& line);
   // True when the whole input was consumed (a read error is not the end).
   bool atEnd() const { return eof_ && pos_ >= buf_.size(); }
+  // True when the input starts like UTF-16 text (reads the first chunk).
+  bool isUtf16();
 
  private:
   bool fill();
+  void start();
+  size_t find(char c, size_t& cached) const;
   std::istream& in_;
   std::string buf_;
   size_t pos_ = 0;
   size_t chunk_ = 64 << 10;
+  // Positions of the next CR and LF at or after pos_ (buf_.size(): none in
+  // the buffer; npos: not searched yet).
+  size_t nextCr_ = std::string::npos;
+  size_t nextLf_ = std::string::npos;
   bool eof_ = false;
+  bool started_ = false;
+  bool utf16_ = false;
 };
 
 // Reads a whole text file into lines; false when it cannot be opened.
@@ -41,7 +70,8 @@ class TextFileWriter {
   TextFileWriter(const TextFileWriter&) = delete;
   TextFileWriter& operator=(const TextFileWriter&) = delete;
 
-  // Creates the temporary file; false (with error()) when it cannot.
+  // Creates the temporary file; false (with error()) when it cannot, also
+  // when the path names something other than a regular file.
   bool open();
   // The line and a CR LF.
   void line(std::string_view text) {
@@ -65,6 +95,7 @@ class TextFileWriter {
   std::string path_;
   std::string tempPath_;
   std::FILE* file_ = nullptr;
+  int slot_ = -1;  // the entry of the temporary file in the removal list
   std::string buf_;
   bool failed_ = false;
   std::string error_;

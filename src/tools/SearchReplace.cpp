@@ -286,6 +286,10 @@ bool RunCommands(Ui& ui, std::istream& input, const std::string& inputPath,
                      commands[i].angleOperand};
   }
   LineReader reader(input);
+  if (reader.isUtf16()) {
+    ui.exclaim(Utf16Refusal(inputPath), kUtf16Title);
+    return false;
+  }
   std::string_view line;
   std::string buffers[2];
   std::string* owner = nullptr;  // the buffer the current entry lives in, if any
@@ -340,6 +344,10 @@ bool RunCommands(Ui& ui, std::istream& input, const std::string& inputPath,
 bool ParseCommands(Ui& ui, std::istream& in, const std::string& path,
                    std::vector<ReplaceCommand>& commands) {
   LineReader reader(in);
+  if (reader.isUtf16()) {
+    ui.exclaim(Utf16Refusal(path), kUtf16Title);
+    return false;
+  }
   std::string_view line;
   size_t lineNo = 0;
   while (reader.next(line)) {

@@ -214,6 +214,10 @@ bool ReadFlexInStream(Ui& ui, std::istream& in, const std::string& path, const F
   ResetPoint(point);
 
   LineReader lines(in);
+  if (lines.isUtf16()) {
+    ui.exclaim(Utf16Refusal(path), kUtf16Title);
+    return false;
+  }
   std::string_view line;
   size_t lineNo = 0;
   while (lines.next(line)) {

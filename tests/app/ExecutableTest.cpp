@@ -2,6 +2,7 @@
 // standard streams and exit status, from a private application folder.
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 
 #include <cstdlib>
@@ -93,6 +94,58 @@ TEST_F(ExecutableTest, BinaryInputIsReportedNotCrashedOn) {
   EXPECT_EQ(r.status, 1);
   EXPECT_EQ(r.err.rfind("exclamation: Invalid VORN Control File\n", 0), 0u) << r.err;
   EXPECT_FALSE(fs::exists(work.file("junk.pac")));
+}
+
+// Every line end reads alike, and a UTF-8 mark is skipped.
+TEST_F(ExecutableTest, LineEndsAndUtf8MarkGiveTheSameOutput) {
+  std::string ctl = ReadFile(work.file("samples/sample.ctl"));
+  ASSERT_EQ(run("'-t|CTL2PAC|samples/sample.ctl|crlf.pac'").status, 0);
+  const std::string expected = ReadFile(work.file("crlf.pac"));
+  auto replaced = [&](const std::string& end) {
+    std::string text;
+    for (size_t at = 0, next; at < ctl.size(); at = next + 2) {
+      next = std::min(ctl.find("\r\n", at), ctl.size());
+      text += ctl.substr(at, next - at) + end;
+    }
+    return text;
+  };
+  for (const auto& [name, text] :
+       {std::pair{"cr.ctl", replaced("\r")}, std::pair{"lf.ctl", replaced("\n")},
+        std::pair{"bom.ctl", "\xEF\xBB\xBF" + ctl}}) {
+    work.write(name, text);
+    Result r = run(std::string("'-t|CTL2PAC|") + name + "|" + name + ".pac'");
+    EXPECT_EQ(r.status, 0) << name << r.err;
+    EXPECT_EQ(ReadFile(work.file(std::string(name) + ".pac")), expected) << name;
+  }
+}
+
+// UTF-16 input and outputs that are no regular files are refused by name;
+// nothing is written.
+TEST_F(ExecutableTest, Utf16InputAndNonRegularOutputAreRefused) {
+  std::string utf16 = "\xFF\xFE";
+  for (char c : std::string("PN:1\r\nFE:TREE\r\n")) utf16 += std::string{c, '\0'};
+  work.write("wide.ctl", utf16);
+  work.write("wide.trn", utf16);
+  // The definition's configuration is a bare name: it is found in the current folder.
+  work.write("FEATCODES.TRN", ReadFile(std::string(ZV_APP_DIR) + "/TRNFiles/FEATCODES.TRN"));
+  ASSERT_EQ(::mkfifo(work.file("pipe").c_str(), 0600), 0);
+  const std::string refusal = "exclamation: Unsupported Text Encoding\nThe file '";
+  struct Case {
+    std::string args, message;
+  } cases[] = {
+      {"'-t|CTL2PAC|wide.ctl|out.pac'", refusal + "wide.ctl' is UTF-16"},
+      {"'-t|REPLCTL|wide.ctl|out.pac'", refusal + "wide.ctl' is UTF-16"},
+      {"'-t|REPLCTL|samples/sample.ctl|out.pac|wide.trn'", refusal + "wide.trn' is UTF-16"},
+      {"'-t|CTL2PAC|samples/sample.ctl|pipe'", "pipe"},
+  };
+  for (const Case& c : cases) {
+    Result r = run(c.args);
+    EXPECT_EQ(r.status, 1) << c.args;
+    EXPECT_NE(r.err.find(c.message), std::string::npos) << c.args << "\n" << r.err;
+    EXPECT_EQ(r.err.find("not a regular file") != std::string::npos, c.message == "pipe");
+    EXPECT_FALSE(fs::exists(work.file("out.pac")));
+  }
+  EXPECT_TRUE(fs::is_fifo(work.file("pipe")));
 }
 
 }  // namespace

@@ -1,5 +1,9 @@
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
+#include <cstdlib>
+#include <filesystem>
 #include <sstream>
 
 #include "app/AppContext.h"
@@ -66,6 +70,32 @@ TEST_F(RunProgramTest, SecondInstanceIsRefusedAlsoForUnattendedCalls) {
   EXPECT_EQ(run("-t|ROUTE|in.ctl|out.pac"), 1);
   EXPECT_EQ(ui.onlyText(), "An instance of VORN Zurevazidu is already running.");
   EXPECT_EQ(ui.boxes[0].title, "VORN Zurevazidu");
+}
+
+TEST_F(RunProgramTest, InstanceLockIsPrivateAndKeyedByUserAndFolderOnly) {
+  test::TempDir runtimeA, runtimeB;
+  std::filesystem::create_directory_symlink(dir.path(), runtimeA.file("link"));
+  const char* old = std::getenv("XDG_RUNTIME_DIR");
+  const std::string saved = old ? old : "";
+  ::setenv("XDG_RUNTIME_DIR", runtimeA.path().c_str(), 1);
+  InstanceLock first(dir.path());
+  ::setenv("XDG_RUNTIME_DIR", runtimeB.path().c_str(), 1);
+  // Another environment or another name of the same folder finds the lock.
+  InstanceLock second(runtimeA.file("link"));
+  InstanceLock other(runtimeB.path());
+  old ? ::setenv("XDG_RUNTIME_DIR", saved.c_str(), 1) : ::unsetenv("XDG_RUNTIME_DIR");
+  EXPECT_TRUE(first.acquired());
+  EXPECT_FALSE(second.acquired());
+  EXPECT_TRUE(other.acquired());
+
+  // The lock folder belongs to the user alone and is no link.
+  int fd = OpenLockFolder();
+  ASSERT_GE(fd, 0);
+  struct stat st {};
+  ASSERT_EQ(::fstat(fd, &st), 0);
+  EXPECT_EQ(st.st_uid, ::getuid());
+  EXPECT_EQ(st.st_mode & 0777, 0700u);
+  ::close(fd);
 }
 
 TEST_F(RunProgramTest, PresetsAreHandedToTheWindow) {

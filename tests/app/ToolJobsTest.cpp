@@ -55,6 +55,10 @@ TEST_F(ToolJobsTest, JobFilesHoldTheLinesEachToolReads) {
 
   ASSERT_TRUE(ConvertToolJob(ui, input, output, "/cfg/CODES.TRN", place));
   EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, "/cfg/CODES"}));
+  // The tool runs in its own folder: a relative configuration reaches it
+  // as an absolute path.
+  ASSERT_TRUE(ConvertToolJob(ui, input, output, "cfg/CODES.TRN", place));
+  EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, (fs::current_path() / "cfg/CODES").string()}));
 
   ASSERT_TRUE(ExtractToolJob(ui, input, output, "/cfg/PICK.TRN", false, place));
   EXPECT_EQ(job("EXTRACT.EXE"), CrLf({input, output, "/cfg/PICK", "N"}));
@@ -115,12 +119,17 @@ TEST_F(ToolJobsTest, LlevWritesTheLimitAndMovesItsResultToTheOutput) {
   EXPECT_TRUE(ui.boxes.empty());
 }
 
-TEST_F(ToolJobsTest, LlevWithoutResultIsReported) {
+TEST_F(ToolJobsTest, LlevWithoutResultIsReportedAndTheInputKept) {
   tool("LLEV.EXE");
-  const std::string input = work.write("run.lev", "x\r\n");
-  EXPECT_FALSE(LlevToolJob(ui, input, work.file("out.prj"), 0, PintrelPlace(app.path())));
-  EXPECT_EQ(ui.onlyText(), "LLEV.EXE left no result file '" + work.file("run.prj") + "'.");
-  EXPECT_FALSE(fs::exists(work.file("out.prj")));
+  // An input ending in "prj" is where the result would be: it is no result.
+  for (const char* name : {"run.lev", "run.prj"}) {
+    ui.boxes.clear();
+    const std::string input = work.write(name, "x\r\n");
+    EXPECT_FALSE(LlevToolJob(ui, input, work.file("out.prj"), 0, PintrelPlace(app.path())));
+    EXPECT_EQ(ui.onlyText(), "LLEV.EXE left no result file '" + work.file("run.prj") + "'.");
+    EXPECT_FALSE(fs::exists(work.file("out.prj")));
+    EXPECT_EQ(ReadFile(input), "x\r\n");
+  }
 }
 
 TEST_F(ToolJobsTest, MissingOrUnstartableToolStopsTheRunByName) {
@@ -133,13 +142,15 @@ TEST_F(ToolJobsTest, MissingOrUnstartableToolStopsTheRunByName) {
   EXPECT_FALSE(fs::exists(output));
   EXPECT_FALSE(fs::exists(app.file("Pintrel/TRANS.JOB")));
 
-  // Present but not executable: the start fails, the job file goes anyway.
-  app.write("Pintrel/SORT.EXE", "not a program");
-  EXPECT_FALSE(SortToolJob(ui, input, output, PintrelPlace(app.path())));
+  // Present but not executable: the start fails, the job file and the
+  // empty output made for the tool go anyway.
+  app.write("Pintrel/PI2PCPT.EXE", "not a program");
+  EXPECT_FALSE(Pi2PcptToolJob(ui, input, output, PintrelPlace(app.path())));
   ASSERT_EQ(ui.boxes.size(), 2u);
   EXPECT_EQ(ui.boxes[1].text,
-            "The program '" + pintrel() + "/SORT.EXE' could not be started: Permission denied");
+            "The program '" + pintrel() + "/PI2PCPT.EXE' could not be started: Permission denied");
   EXPECT_FALSE(fs::exists(app.file("Pintrel/TRANS.JOB")));
+  EXPECT_FALSE(fs::exists(output));
 
   // Through the dispatcher the run stops with the same message.
   const std::string def = work.write("conv.uti", CrLf({"PCPT2PI.EXE", "", "a", "b"}));
@@ -219,6 +230,28 @@ TEST_F(ToolRoutinesTest, ExtractAndLlevAskFirst) {
   ASSERT_TRUE(translate("LLEV.EXE"));
   EXPECT_EQ(job("LLEV.EXE"), CrLf({input, "0"}));
   EXPECT_EQ(ReadFile(work.file("out.txt")), "r");
+}
+
+// A UI that notes whether the answer file was there at the first message.
+struct AnswerWatchUi : ScriptedUi {
+  Answer message(const std::string& text, Icon icon, Buttons buttons,
+                 const std::string& title) override {
+    if (boxes.empty()) answerAtFirstBox = fs::exists(answer);
+    return ScriptedUi::message(text, icon, buttons, title);
+  }
+  std::string answer;
+  bool answerAtFirstBox = true;
+};
+
+TEST(CoordConvertRoutineTest, RemovesAnOldAnswerBeforeItStarts) {
+  test::TempDir app;
+  AnswerWatchUi ui;
+  ui.answer = app.write("tccout.tmp", "an answer of an earlier run\r\n");
+  AppContext ctx(ui, app.path());
+  EXPECT_FALSE(Translate(ctx, {"", "tccin.tmp", "tccout.tmp", ""}));  // no tccin.tmp
+  ASSERT_FALSE(ui.boxes.empty());
+  EXPECT_FALSE(ui.answerAtFirstBox);
+  EXPECT_FALSE(fs::exists(ui.answer));
 }
 
 TEST(ProcessTest, RunsAndWaitsInTheWorkingFolder) {

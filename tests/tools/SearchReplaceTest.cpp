@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <filesystem>
 #include <sstream>
 
 #include "platform/ScriptedUi.h"
@@ -107,6 +108,24 @@ TEST(SearchReplaceFile, ShippedCommandFilesRunOnTheSample) {
     ASSERT_NE(ReadFile(app + "samples/sample.ctl").find(c.before), std::string::npos) << c.trn;
     EXPECT_NE(ReadFile(out).find(c.after), std::string::npos) << c.trn;
   }
+}
+
+// The fuzzer splits its input at the first NUL into command file and input:
+// every seed must hold both and filter, so that fuzzing starts past the parser.
+TEST(SearchReplaceFile, FuzzSeedsFilter) {
+  size_t seeds = 0;
+  for (const auto& entry : std::filesystem::directory_iterator(kFixtures + "fuzz-seeds")) {
+    const std::string all = ReadFile(entry.path().string());
+    const size_t split = all.find('\0');
+    ASSERT_NE(split, std::string::npos) << entry.path();
+    std::istringstream cmd(all.substr(0, split)), in(all.substr(split + 1));
+    ScriptedUi ui;
+    std::string out;
+    EXPECT_TRUE(SearchAndReplaceStreams(ui, in, cmd, out, "in.ctl", "cmd.TRN"))
+        << entry.path() << ": " << ui.onlyText();
+    ++seeds;
+  }
+  EXPECT_GE(seeds, 3u);
 }
 
 TEST(SearchReplaceCommands, ReplacementForms) {
