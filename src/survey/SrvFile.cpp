@@ -299,6 +299,25 @@ void AppendDescription(std::string& out, std::string_view text) {
   }
 }
 
+bool HasBreak(std::string_view text) {
+  return text.find_first_of(" \r\n") != std::string_view::npos;
+}
+
+// Names and codes must stay one token of their line: blanks become "_".
+void AppendOneToken(std::string& out, std::string_view text) {
+  size_t from = out.size();
+  out += text;
+  for (size_t i = from; i < out.size(); ++i) {
+    if (out[i] == ' ' || out[i] == '\r' || out[i] == '\n') out[i] = '_';
+  }
+}
+
+std::string OneToken(std::string_view text) {
+  std::string token;
+  AppendOneToken(token, text);
+  return token;
+}
+
 void AppendPointLine(std::string& out, SurveyPoint& p, const std::string& unit) {
   p.Easting = ConvertLength(p.Easting, p.HorizontalUnits, unit);
   p.Northing = ConvertLength(p.Northing, p.HorizontalUnits, unit);
@@ -312,23 +331,12 @@ void AppendPointLine(std::string& out, SurveyPoint& p, const std::string& unit) 
   out += ' ';
   AppendFixed(out, p.Elevation, 4);
   out += ' ';
-  out += p.FeatureCode.empty() ? std::string_view("-1") : std::string_view(p.FeatureCode);
+  AppendOneToken(out,
+                 p.FeatureCode.empty() ? std::string_view("-1") : std::string_view(p.FeatureCode));
   out += ' ';
-  out += p.PointName;
+  AppendOneToken(out, p.PointName);
   out += ' ';
   AppendDescription(out, p.DescriptionLines);
-}
-
-bool HasBreak(std::string_view text) {
-  return text.find_first_of(" \r\n") != std::string_view::npos;
-}
-
-// A chain name must stay one token of the BEGIN line.
-std::string OneToken(std::string name) {
-  for (char& c : name) {
-    if (c == ' ' || c == '\r' || c == '\n') c = '_';
-  }
-  return name;
 }
 
 class SrvWriter {
@@ -367,6 +375,7 @@ class SrvWriter {
       ReportWriteFailure(ui_, path_, out_.error());
       return false;
     }
+    notes_.show(ui_, path_);
     return true;
   }
 
@@ -377,8 +386,8 @@ class SrvWriter {
     std::vector<size_t> rows;  // point indexes; kEmptyRow for a point already written
   };
 
-  // A point id must be one non-empty token and a feature code must not hold
-  // blanks, or the file would read back with other names and codes.
+  // A point id must not be empty; blanks in ids and feature codes are
+  // written as "_" so that each stays one token.
   bool checkPoints() {
     const std::vector<SurveyPoint>& points = work_.OutputPoints;
     for (size_t i = 0; i < points.size(); ++i) {
@@ -390,11 +399,7 @@ class SrvWriter {
         return false;
       }
       if (HasBreak(p.PointName) || HasBreak(p.FeatureCode)) {
-        ui_.message("Point '" + p.PointName +
-                        "' can not be written to a CAiCE SRV File.  Its point id and feature "
-                        "code must not contain blanks.",
-                    Icon::Exclamation, Buttons::Ok, kAppTitle);
-        return false;
+        notes_.add("had blanks in their point id or feature code, written as \"_\"", p.PointName);
       }
     }
     return true;
@@ -514,6 +519,7 @@ class SrvWriter {
   TextFileWriter out_;
   std::string unit_;
   int unnamed_ = 0;
+  OutputNotes notes_;
 };
 
 }  // namespace

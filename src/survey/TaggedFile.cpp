@@ -1,5 +1,6 @@
 #include "survey/TaggedFile.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cfloat>
 #include <cmath>
@@ -223,7 +224,12 @@ class TaggedReader {
       case TagAction::ScaleFactor:
         return number(value, p.ScaleFactor, action);
       case TagAction::Description:
-        AppendLine(p.DescriptionLines, line);
+        // A project section's PD lines describe the file, not a point.
+        if (inProject_ && !format_.projectSectionKeepsPoint) {
+          unknown(line);
+        } else {
+          AppendLine(p.DescriptionLines, line);
+        }
         return true;
       case TagAction::FeatureCode:
         (inChain_ ? chain_.FeatureCode : p.FeatureCode).assign(value);
@@ -285,6 +291,9 @@ class TaggedReader {
   void section(std::string_view value) {
     std::string_view code = value.substr(0, 2);
     if (code == "PR") {
+      // The point before a project section is stored here, before the
+      // section's UL line can change the units it was read in.
+      if (!inProject_ && HoldsData(points_.back())) storePoint();
       inProject_ = true;
       return;
     }
@@ -299,7 +308,6 @@ class TaggedReader {
     if (format_.projectSectionKeepsPoint) {
       if (!inProject_) storePoint();
     } else {
-      // A point followed by a project section is stored, not dropped.
       if (!inProject_ || HoldsData(points_.back())) {
         storePoint();
       } else {
@@ -467,6 +475,9 @@ class TaggedWriter {
   }
 
   void point(SurveyPoint& p) {
+    if (p.PointName.size() > 8) {
+      notes_.add("have names longer than 8 characters and will not read back", p.PointName);
+    }
     convert(p);
     std::string& b = out_.buffer();
     if (format_.pointOpening.empty()) {
@@ -534,6 +545,8 @@ class TaggedWriter {
     tagged("CP:", ChainListDate(std::time(nullptr)));
   }
 
+  const OutputNotes& notes() const { return notes_; }
+
  private:
   // Converts the linear values of the point into the output unit and stores
   // them back. A value whose unit cannot be converted stays as it is (and
@@ -591,6 +604,7 @@ class TaggedWriter {
   bool latLong_;
   bool convergence_;
   bool scaleFactor_;
+  OutputNotes notes_;
 };
 
 }  // namespace
@@ -643,12 +657,35 @@ bool WriteTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const Tagg
     ReportWriteFailure(ui, path, out.error());
     return false;
   }
+  writer.notes().show(ui, path);
   return true;
 }
 
 void ReportWriteFailure(Ui& ui, const std::string& path, const std::string& reason) {
   ui.message("The file '" + path + "' could not be written." + std::string(kCrLf) + reason,
              Icon::Exclamation, Buttons::Ok, "File Not Written");
+}
+
+void OutputNotes::add(std::string_view reason, const std::string& pointName) {
+  auto note =
+      std::find_if(notes_.begin(), notes_.end(), [&](const Note& n) { return n.reason == reason; });
+  if (note == notes_.end()) note = notes_.insert(notes_.end(), Note{std::string(reason), 0, {}});
+  if (note->names.size() < 5) note->names.push_back(pointName);
+  ++note->count;
+}
+
+void OutputNotes::show(Ui& ui, const std::string& path) const {
+  if (notes_.empty()) return;
+  std::string text = "The file '" + path + "' was written, but:";
+  for (const Note& n : notes_) {
+    text += std::string(kCrLf) + std::to_string(n.count) + " point(s) " + n.reason + ": ";
+    for (size_t i = 0; i < n.names.size(); ++i) {
+      if (i > 0) text += ", ";
+      text += "'" + n.names[i] + "'";
+    }
+    text += n.count > n.names.size() ? ", ..." : ".";
+  }
+  ui.exclaim(text, "Check Output File");
 }
 
 std::string VersionLine() {

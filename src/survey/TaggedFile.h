@@ -69,7 +69,8 @@ struct TaggedFormat {
   bool fieldErrorsAsLineRule;       // field errors use the line-rule layout
   bool hasChains;                   // AC:CH sections, BG/EG/CP lines, chain list
   // Point tags inside a project section carry into the next point instead of
-  // being stored or dropped at the next AC line.
+  // being stored at the next AC line; without it, PD lines there are header
+  // lines.
   bool projectSectionKeepsPoint;
   bool pointRecordCodes;           // the AC value of a point is its RecordCode
   std::span<const TagRule> rules;  // the tags beyond the shared ones

@@ -170,20 +170,22 @@ class WsiReader {
   std::string group_;
 };
 
-// Appends `text` right-aligned in `width` columns; false when it is wider.
+// Appends `text` aligned in `width` columns, cut to its first `width`
+// characters; false when it had to be cut.
 bool AppendRight(std::string& out, std::string_view text, size_t width) {
-  if (text.size() > width) return false;
-  out.append(width - text.size(), ' ');
-  out.append(text);
-  return true;
+  if (text.size() < width) out.append(width - text.size(), ' ');
+  out.append(text.substr(0, width));
+  return text.size() <= width;
 }
 
 bool AppendLeft(std::string& out, std::string_view text, size_t width) {
-  if (text.size() > width) return false;
-  out.append(text);
-  out.append(width - text.size(), ' ');
-  return true;
+  out.append(text.substr(0, width));
+  if (text.size() < width) out.append(width - text.size(), ' ');
+  return text.size() <= width;
 }
+
+constexpr std::string_view kCutNote = "had values cut to fit their columns";
+constexpr std::string_view kNoUnitNote = "had no unit and were taken as metres";
 
 class WsiWriter {
  public:
@@ -205,11 +207,12 @@ class WsiWriter {
       return false;
     }
     writeHeader(header);
-    if (!writeGroups()) return false;
+    writeGroups();
     if (!out_.commit()) {
       ReportWriteFailure(ui_, path_, out_.error());
       return false;
     }
+    notes_.show(ui_, path_);
     return true;
   }
 
@@ -266,7 +269,7 @@ class WsiWriter {
     if (!extra.empty()) out_.line(extra);
   }
 
-  bool writeGroups() {
+  void writeGroups() {
     // Group names in order of first appearance; unnamed points last.
     std::vector<std::string_view> names;
     std::vector<std::vector<size_t>> members;
@@ -286,14 +289,11 @@ class WsiWriter {
       }
       members[it->second].push_back(i);
     }
-    for (size_t g = 0; g < names.size(); ++g) {
-      if (!writeGroup(names[g], members[g])) return false;
-    }
-    if (!unnamed.empty() && !writeGroup(kUnclassified, unnamed)) return false;
-    return true;
+    for (size_t g = 0; g < names.size(); ++g) writeGroup(names[g], members[g]);
+    if (!unnamed.empty()) writeGroup(kUnclassified, unnamed);
   }
 
-  bool writeGroup(std::string_view name, const std::vector<size_t>& members) {
+  void writeGroup(std::string_view name, const std::vector<size_t>& members) {
     out_.line("");
     std::string& b = out_.buffer();
     b += "GR:";
@@ -305,7 +305,7 @@ class WsiWriter {
     bool benchMarks = name == kBenchMarks;
     for (size_t i : members) {
       SurveyPoint& p = work_.OutputPoints[i];
-      if (!writeRow(p)) return false;
+      writeRow(p);
       if (benchMarks) {
         for (std::string_view tag : {"OW:", "TY:", "NM:"}) {
           std::string line = TakeTaggedLine(p.ExtraLines, tag, true, false);
@@ -314,24 +314,29 @@ class WsiWriter {
         if (!p.DescriptionLines.empty()) out_.line(p.DescriptionLines);
       }
     }
-    return true;
   }
 
-  bool refuse(const SurveyPoint& p, const char* what) {
-    ui_.message("Point '" + p.PointName +
-                    "' can not be written to a Wisconsin Summary Index File.  Its " + what +
-                    " does not fit its column.",
-                Icon::Exclamation, Buttons::Ok, kAppTitle);
+  // A number too wide for its column loses decimals; one that does not fit
+  // even without them is left blank, so that it reads back as absent rather
+  // than as another number.
+  bool appendNumber(std::string& b, double value, size_t width) {
+    for (int decimals = 3; decimals >= 0; --decimals) {
+      number_.clear();
+      AppendFixed(number_, value, decimals);
+      if (number_.size() <= width) {
+        AppendRight(b, number_, width);
+        return decimals == 3;
+      }
+    }
+    b.append(width, ' ');
     return false;
   }
 
-  bool appendNumber(std::string& b, double value, size_t width) {
-    number_.clear();
-    AppendFixed(number_, value, 3);
-    return AppendRight(b, number_, width);
-  }
-
-  bool writeRow(SurveyPoint& p) {
+  void writeRow(SurveyPoint& p) {
+    if ((p.HorizontalUnits.empty() && (p.Easting != kNoValue || p.Northing != kNoValue)) ||
+        (p.VerticalUnits.empty() && (p.Elevation != kNoValue || p.EllipsoidHeight != kNoValue))) {
+      notes_.add(kNoUnitNote, p.PointName);
+    }
     p.Northing = ToMetres(p.Northing, p.HorizontalUnits);
     p.Easting = ToMetres(p.Easting, p.HorizontalUnits);
     double& height = ellipsoidHeights_ ? p.EllipsoidHeight : p.Elevation;
@@ -340,35 +345,36 @@ class WsiWriter {
     std::string av = TakeTaggedLine(p.ExtraLines, "AV:", false, true);
 
     std::string& b = out_.buffer();
+    bool fits = true;
     b += "  ";
-    if (!AppendRight(b, p.PointName, 8)) return refuse(p, "point name");
+    fits &= AppendRight(b, p.PointName, 8);
     if (p.Easting == kNoValue) {
       b.append(31, ' ');
     } else {
       b += "  ";
-      if (!appendNumber(b, p.Easting, 14)) return refuse(p, "easting");
+      fits &= appendNumber(b, p.Easting, 14);
       b += "  ";
-      if (!appendNumber(b, p.Northing, 13)) return refuse(p, "northing");
+      fits &= appendNumber(b, p.Northing, 13);
     }
     if (height == kNoValue) {
       b.append(15, ' ');
     } else {
       b += "  ";
-      if (!appendNumber(b, height, 13)) return refuse(p, "elevation");
+      fits &= appendNumber(b, height, 13);
     }
     if (p.FeatureCode.empty()) {
       b.append(16, ' ');
     } else {
       b += "  ";
-      if (!AppendLeft(b, p.FeatureCode, 14)) return refuse(p, "remarks");
+      fits &= AppendLeft(b, p.FeatureCode, 14);
     }
     // AH is widened to its two columns so that AV stays in columns 79-80.
     b += "  ";
-    if (!AppendLeft(b, ah, 2)) return refuse(p, "AH value");
+    fits &= AppendLeft(b, ah, 2);
     b += "  ";
-    if (!AppendLeft(b, av, 2)) return refuse(p, "AV value");
+    fits &= AppendLeft(b, av, 2);
     out_.lineDone();
-    return true;
+    if (!fits) notes_.add(kCutNote, p.PointName);
   }
 
   Ui& ui_;
@@ -377,6 +383,7 @@ class WsiWriter {
   TextFileWriter out_;
   bool ellipsoidHeights_ = false;
   std::string number_;
+  OutputNotes notes_;
 };
 
 }  // namespace

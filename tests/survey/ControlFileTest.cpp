@@ -113,17 +113,12 @@ TEST_F(SurveyControlFile, SectionSwitchQuirks) {
   EXPECT_EQ(work.InputHeader.HeaderExtraLines, "CM:header comment");
   EXPECT_EQ(p.ExtraLines, "");
 
-  // A second project section: the point before it runs on into the next.
-  ASSERT_TRUE(read("second_project_section.CTL"));
-  ASSERT_EQ(work.InputPoints.size(), 1u);
-  EXPECT_EQ(work.InputPoints[0].PointName, "2");
-  EXPECT_EQ(work.InputPoints[0].Northing, 2);
-  EXPECT_EQ(work.InputPoints[0].Elevation, 1);
-
   // Only the first two characters of the AC value are compared.
   ASSERT_TRUE(read("project_prefix.CTL"));
-  ASSERT_EQ(work.InputPoints.size(), 2u);
-  EXPECT_EQ(work.InputPoints[1].PointName, "2");
+  ASSERT_EQ(work.InputPoints.size(), 3u);
+  EXPECT_EQ(work.InputPoints[1].PointName, "1");
+  EXPECT_EQ(work.InputPoints[2].PointName, "2");
+  EXPECT_EQ(work.InputPoints[2].Northing, kNoValue);
   EXPECT_EQ(work.InputHeader.HeaderExtraLines, "CM:x");
 
   // No AC line at all: one point; an empty file: one empty point.
@@ -395,30 +390,6 @@ TEST_F(SurveyControlFile, RoundTripAddsOneVersionLine) {
   EXPECT_EQ(lines[3], VersionLine());
   EXPECT_EQ(lines[4], "CM:extra");
   EXPECT_TRUE(ui.boxes.empty());
-}
-
-TEST_F(SurveyControlFile, WriteFailureKeepsTheTarget) {
-  TempDir dir;
-  work.OutputPoints.resize(1);
-  // A missing folder: the file cannot be created.
-  std::string path = dir.file("missing/out.CTL");
-  EXPECT_FALSE(WriteControlFile(ui, work, path));
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].title, "File Not Written");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-  EXPECT_EQ(ui.boxes[0].text.rfind("The file '" + path + "' could not be written.\r\n", 0), 0u);
-  EXPECT_GT(ui.boxes[0].text.size(), path.size() + 35);  // carries the reason
-
-  // A target that cannot be replaced: nothing half-written is left behind.
-  ui.boxes.clear();
-  std::filesystem::create_directory(dir.file("taken"));
-  dir.write("taken/keep.txt", "x");
-  EXPECT_FALSE(WriteControlFile(ui, work, dir.file("taken")));
-  EXPECT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ReadFile(dir.file("taken/keep.txt")), "x");
-  int entries = 0;
-  for ([[maybe_unused]] const auto& e : std::filesystem::directory_iterator(dir.path())) ++entries;
-  EXPECT_EQ(entries, 1);
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include "support/TempDir.h"
 #include "survey/SrvFile.h"
 #include "survey/SurveyTestSupport.h"
+#include "survey/WsiFile.h"
 
 namespace zv {
 namespace {
@@ -320,19 +321,34 @@ TEST_F(SrvFile, RefusalsWriteNothing) {
   EXPECT_EQ(ui.boxes[0].title, "Plane Coordiantes Required");
   EXPECT_EQ(ui.boxes[0].text, "A Caice SRV File must contain plane coordinates.");
 
-  // Names and codes that would not read back as themselves.
   work.OutputHeader.CoordinateSystem = "";
-  ui.boxes.clear();
-  work.OutputPoints[0].PointName = "A 1";
-  EXPECT_FALSE(WriteSrvFile(ui, work, path));
-  EXPECT_EQ(ui.onlyText(),
-            "Point 'A 1' can not be written to a CAiCE SRV File.  Its point id and feature code "
-            "must not contain blanks.");
   ui.boxes.clear();
   work.OutputPoints[0].PointName = "";
   EXPECT_FALSE(WriteSrvFile(ui, work, path));
   EXPECT_EQ(ui.onlyText(), "Point 1 has no point id and can not be written to a CAiCE SRV File.");
   EXPECT_FALSE(std::filesystem::exists(path));
+}
+
+// Blanks in ids and feature codes (the shipped WSI sample has remarks such as
+// "CONTROL PT") become "_" and are named in one warning.
+TEST_F(SrvFile, BlanksInNamesAndCodesAreWrittenAsUnderscores) {
+  ASSERT_TRUE(ReadWsiFile(ui, work, std::string(ZV_SOURCE_DIR) + "/appdata/samples/sample.wsi"));
+  work.copyInputToOutput();
+  work.OutputPoints[1].PointName = "A 1";
+  std::string path = dir.file("out.SRV");
+  ASSERT_TRUE(WriteSrvFile(ui, work, path));
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].title, "Check Output File");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
+  EXPECT_EQ(ui.boxes[0].text,
+            "The file '" + path +
+                "' was written, but:\r\n7 point(s) had blanks in their point id or feature code, "
+                "written as \"_\": '1001', 'A 1', '1003', '1004', '1005', ...");
+  size_t count = work.OutputPoints.size();
+  ASSERT_TRUE(ReadSrvFile(ui, work, path));
+  ASSERT_EQ(work.InputPoints.size(), count);
+  EXPECT_EQ(work.InputPoints[0].FeatureCode, "CONTROL_PT");
+  EXPECT_EQ(work.InputPoints[1].PointName, "A_1");
 }
 
 TEST_F(SrvFile, SampleInTheApplicationFolderReads) {

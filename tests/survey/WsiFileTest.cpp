@@ -273,15 +273,29 @@ TEST_F(WsiFile, RefusalsWriteNothing) {
   EXPECT_EQ(ui.boxes[0].text, "A Wisconsin Summary Index File must contain plane coordinates.");
   EXPECT_FALSE(std::filesystem::exists(path));
 
-  // A value wider than its column would read back as another value.
-  ui.boxes.clear();
-  work.OutputHeader.CoordinateSystem = "WISCRS";
-  addPoint("LONGNAME9", 1, 2, 3);
-  EXPECT_FALSE(WriteWsiFile(ui, work, path));
-  EXPECT_EQ(ui.onlyText(),
-            "Point 'LONGNAME9' can not be written to a Wisconsin Summary Index File.  Its point "
-            "name does not fit its column.");
   EXPECT_TRUE(std::filesystem::is_empty(dir.path()));
+}
+
+// Values wider than their columns are cut (numbers lose decimals first, and
+// are left blank when even that is too wide); points without a unit are
+// written as metres. One warning names the points.
+TEST_F(WsiFile, OversizeValuesAreCutAndMissingUnitsNamed) {
+  addPoint("1", 1234567890.1234, 1234567890.1234, 1e13).FeatureCode = "FIFTEEN CHARS X";
+  addPoint("2", 1, 2, 3).ExtraLines = "AH:ABC\r\nAV:7";
+  SurveyPoint& bare = addPoint("3", 5, 6, 7);
+  bare.HorizontalUnits = bare.VerticalUnits = "";
+  std::vector<std::string> r = rows();
+  ASSERT_EQ(r.size(), 3u);
+  EXPECT_EQ(r[0],
+            "         1  1234567890.123  1234567890.12                 FIFTEEN CHARS         ");
+  EXPECT_EQ(r[1].substr(72), "  AB  7 ");
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].title, "Check Output File");
+  EXPECT_EQ(ui.boxes[0].text, "The file '" + dir.file("out.WSI") +
+                                  "' was written, but:\r\n2 point(s) had values cut to fit their "
+                                  "columns: '1', '2'.\r\n1 point(s) had no unit and were taken as "
+                                  "metres: '3'.");
+  EXPECT_EQ(r[2].substr(12, 14), "         5.000");
 }
 
 TEST(WsiTakeTaggedLine, LastMatchAndRemoval) {
