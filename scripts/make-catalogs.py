@@ -228,14 +228,17 @@ def zone_entry(db, conversion_code, nad27, unit, full_name, datum, vertical, com
         northing = metres_to(unit, epsg_length_metres(*fn))
         easting = metres_to(unit, epsg_length_metres(*fe))
 
+    # Central meridians east of Greenwich (UTM 59N, 60N) are written east-positive.
+    lon_direction = "E" if lon > 0 else "W"
     keys = [("Full Name", full_name), ("Horizontal Datum", datum),
             ("Computational Ellipsoid", comp_ellipsoid), ("Vertical Datum", vertical),
             ("Projection", projection), ("Show In", "1"), ("Show Out", "1"),
-            ("Central Latitude", packed(lat)), ("Central Longitude", packed(-lon)),
+            ("Central Latitude", packed(lat)),
+            ("Central Longitude", packed(lon if lon > 0 else -lon)),
             ("False Northing", plain(northing)), ("False Easting", plain(easting))]
     keys += extra
-    keys += [("Positive Latitude Direction", "N"), ("Positive Longitude Direction", "W"),
-             ("Linear Units", unit)]
+    keys += [("Positive Latitude Direction", "N"),
+             ("Positive Longitude Direction", lon_direction), ("Linear Units", unit)]
     order = ["Full Name", "Horizontal Datum", "Computational Ellipsoid", "Vertical Datum",
              "Projection", "Show In", "Show Out", "Central Latitude", "Central Longitude",
              "False Northing", "False Easting", "Scale Factor", "Northern Parallel",
@@ -339,14 +342,20 @@ def spcs27_zones(db):
     return [(short, keys) for _, short, keys in zones]
 
 
-def utm_zones(db, geodetic, first_code, datum, vertical, ellipsoid_note):
+# UTM zones north of the United States: 1N to 20N, and 59N, 60N for the
+# western Aleutians.
+UTM_ZONES = list(range(1, 21)) + [59, 60]
+
+
+def utm_zones(db, geodetic, datum, vertical):
     zones = []
-    for n in range(1, 21):
-        crs = first_code + n
+    for n in UTM_ZONES:
+        name = "%s / UTM zone %dN" % (datum.replace(" ", ""), n)
         row = db.c.execute(
-            "select name, conversion_code from projected_crs where auth_name='EPSG' and code=? "
-            "and geodetic_crs_code=?", (crs, geodetic)).fetchone()
-        assert row, crs
+            "select code, conversion_code from projected_crs where auth_name='EPSG' and "
+            "deprecated=0 and name=? and geodetic_crs_code=?", (name, geodetic)).fetchone()
+        assert row, name
+        crs = row[0]
         full = "UTM zone %dN, %s (EPSG:%d)" % (n, datum, crs)
         zones.append(("Zone %dN" % n,
                       zone_entry(db, row[1], False, METERS, full, datum, vertical)))
@@ -457,8 +466,8 @@ def main():
     for system, entries in (
             ("State Plane 1983", spcs83_zones(db)),
             ("State Plane 1927", spcs27_zones(db)),
-            ("UTM NAD 83", utm_zones(db, "4269", 26900, "NAD 83", "NAVD 88", "")),
-            ("UTM NAD 27", utm_zones(db, "4267", 26700, "NAD 27", "NGVD 29", ""))):
+            ("UTM NAD 83", utm_zones(db, "4269", "NAD 83", "NAVD 88")),
+            ("UTM NAD 27", utm_zones(db, "4267", "NAD 27", "NGVD 29"))):
         counts[system] = len(entries)
         zones += [(system + "~" + short, keys) for short, keys in entries]
     names = [n.lower() for n, _ in zones]

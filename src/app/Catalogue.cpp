@@ -40,15 +40,10 @@ bool Catalogue::load(const std::string& appFolder) {
   for (fs::directory_iterator it(fs::path(appFolder) / "UTIFiles", ec), end; !ec && it != end;
        it.increment(ec)) {
     const fs::path& p = it->path();
-    if (p.extension() == ".uti" && it->is_regular_file(ec)) files.push_back(p);
+    if (EqualsNoCase(p.extension().string(), ".uti") && it->is_regular_file(ec)) files.push_back(p);
   }
-  auto lower = [](std::string s) {
-    std::transform(s.begin(), s.end(), s.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-    return s;
-  };
   std::sort(files.begin(), files.end(), [&](const fs::path& a, const fs::path& b) {
-    return lower(a.filename().string()) < lower(b.filename().string());
+    return ToLower(a.filename().string()) < ToLower(b.filename().string());
   });
   for (const auto& file : files) {
     TranslationDefinition def;

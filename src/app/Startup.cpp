@@ -19,6 +19,7 @@
 #include "app/AppContext.h"
 #include "app/Dispatcher.h"
 #include "platform/Numbers.h"
+#include "platform/Strings.h"
 
 namespace zv {
 
@@ -45,9 +46,7 @@ ParsedCommandLine ParseCommandLine(const std::string& argumentText) {
 }
 
 bool ParseTruthValue(const std::string& text, bool& value) {
-  std::string lower = text;
-  std::transform(lower.begin(), lower.end(), lower.begin(),
-                 [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+  const std::string lower = ToLower(text);
   if (lower == "true" || lower == "false") {
     value = lower == "true";
     return true;

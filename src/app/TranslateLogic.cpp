@@ -8,23 +8,18 @@
 #include "app/AppContext.h"
 #include "app/FileTypes.h"
 #include "platform/Error.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
 
 namespace {
 
-std::string Lower(std::string s) {
-  std::transform(s.begin(), s.end(), s.begin(),
-                 [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-  return s;
-}
-
 // Equal apart from letter case, or two names of one existing file (a
 // relative and an absolute path, a link): writing the output must never
 // replace the input.
 bool SameFile(const std::string& a, const std::string& b) {
-  if (Lower(a) == Lower(b)) return true;
+  if (EqualsNoCase(a, b)) return true;
   std::error_code ec;
   return std::filesystem::equivalent(a, b, ec) && !ec;
 }

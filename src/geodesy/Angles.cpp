@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "platform/Error.h"
+#include "platform/Strings.h"
 
 namespace zv {
 
@@ -14,12 +15,6 @@ constexpr double kMaxSeconds = 59.9999999999999;
 
 bool IsDigit(char c) {
   return c >= '0' && c <= '9';
-}
-
-std::string_view TrimBlanks(std::string_view s) {
-  while (!s.empty() && (s.front() == ' ' || s.front() == '\t')) s.remove_prefix(1);
-  while (!s.empty() && (s.back() == ' ' || s.back() == '\t')) s.remove_suffix(1);
-  return s;
 }
 
 [[noreturn]] void TypeMismatch(const char* routine) {
@@ -103,13 +98,13 @@ double ToRadians(bool negative, int degrees, double minutes, double seconds) {
 
 // Splits at blanks (runs of blanks count as one); at most `count` fields.
 int SplitFields(std::string_view text, std::string_view* fields, int count) {
-  std::string_view s = TrimBlanks(text);
+  std::string_view s = Trim(text);
   int n = 0;
   while (!s.empty() && n < count) {
     size_t blank = s.find(' ');
     fields[n++] = s.substr(0, blank);
     if (blank == std::string_view::npos) break;
-    s = TrimBlanks(s.substr(blank));
+    s = Trim(s.substr(blank));
   }
   return n;
 }
@@ -255,7 +250,7 @@ double Angles_DMToRadians(Ui& ui, std::string_view text) {
 
 double Angles_PackedToRadians(Ui& ui, std::string_view text) {
   static constexpr const char* kRoutine = "Angles_PackedToRadians";
-  std::string_view s = TrimBlanks(text);
+  std::string_view s = Trim(text);
   size_t point = s.find('.');
   bool negative = false;
   int degrees = ParseDegrees(s.substr(0, point), negative, kRoutine);
@@ -286,7 +281,7 @@ double Angles_PackedToRadians(Ui& ui, std::string_view text) {
 }
 
 double Angles_DecimalToRadians(std::string_view text) {
-  return ParseDecimal(TrimBlanks(text), "Angles_DecimalToRadians") * kDegreesToRadians;
+  return ParseDecimal(Trim(text), "Angles_DecimalToRadians") * kDegreesToRadians;
 }
 
 std::string Angles_RadiansToDecimal(double radians, int decimals, bool withSymbols) {

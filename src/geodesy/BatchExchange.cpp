@@ -10,6 +10,7 @@
 #include "platform/Error.h"
 #include "platform/Numbers.h"
 #include "platform/Profile.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
@@ -17,11 +18,6 @@ namespace zv {
 namespace {
 
 constexpr const char* kRefusalTitle = "Invalid Coordinate Request";
-
-std::string Trim(std::string_view s) {
-  size_t b = s.find_first_not_of(" \t"), e = s.find_last_not_of(" \t");
-  return b == std::string_view::npos ? std::string() : std::string(s.substr(b, e - b + 1));
-}
 
 // The full unit name of a code or name; empty when it is neither.
 std::string UnitName(const std::string& text) {
@@ -64,7 +60,7 @@ class PointLineReader {
 
   // A number, or kNoValue for an empty optional field.
   bool number(std::string_view field, const char* what, bool required, double& value) {
-    std::string text = Trim(field);
+    std::string text(Trim(field));
     if (text.empty() && !required) {
       value = kNoValue;
       return true;
@@ -84,7 +80,7 @@ class PointLineReader {
 
   // A packed "DDD.MMSSssss" angle, north- or west-positive.
   bool angle(std::string_view field, const char* what, double& value) {
-    std::string text = Trim(field);
+    std::string text(Trim(field));
     if (!IsNumeric(text)) {
       return refuse(std::string("gives the ") + what + " '" + text + "', not a number.");
     }
@@ -221,12 +217,7 @@ std::string FindExchangeZone(const std::string& appFolder, const std::string& co
   };
   if (!coordinateSystem.empty() && !zone.empty()) {
     const std::string wanted = coordinateSystem + "~" + zone;
-    auto same = [&](const std::string& s) {
-      return std::equal(s.begin(), s.end(), wanted.begin(), wanted.end(), [](char a, char b) {
-        return std::tolower(static_cast<unsigned char>(a)) ==
-               std::tolower(static_cast<unsigned char>(b));
-      });
-    };
+    auto same = [&](const std::string& s) { return EqualsNoCase(s, wanted); };
     auto found = std::find_if(sections.begin(), sections.end(), same);
     if (found != sections.end() && datumOf(*found) == horizontalDatum) return *found;
   }
@@ -251,8 +242,7 @@ bool WriteExchangeAnswer(Ui& ui, const std::string& path, const ConversionState&
     return false;
   }
   const std::tm now = state.now();
-  out.line(std::string(kAppTitle) + " " + std::to_string(kVersionMajor) + "." +
-           std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision));
+  out.line(kTitleAndVersion);
   out.line(FormatDate(now) + " " + FormatTime(now));
   out.line(automatic ? "Automatic" : "Manual");
   out.line(state.batchGrid ? "Plane" : "Geographic");

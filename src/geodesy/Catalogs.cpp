@@ -7,24 +7,12 @@
 #include "platform/Error.h"
 #include "platform/Numbers.h"
 #include "platform/Profile.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
 
 namespace {
-
-std::string Trim(std::string_view s) {
-  while (!s.empty() && s.front() == ' ') s.remove_prefix(1);
-  while (!s.empty() && s.back() == ' ') s.remove_suffix(1);
-  return std::string(s);
-}
-
-bool SameName(std::string_view a, std::string_view b) {
-  return a.size() == b.size() &&
-         std::equal(a.begin(), a.end(), b.begin(), [](unsigned char x, unsigned char y) {
-           return std::tolower(x) == std::tolower(y);
-         });
-}
 
 // A list flag ("Show", "Show In", "Show Out") read as a number.
 bool FlagIsOne(const std::string& value, const char* source) {
@@ -63,7 +51,7 @@ std::vector<std::string> LOAD_CS_ComboBoxList(const std::string& appFolder) {
     if (tilde == std::string::npos) {
       throw ZvError(1, "Error loading coordinate systems.", "modMisc.LOAD_CS_ComboBoxList");
     }
-    std::string system = Trim(std::string_view(name).substr(0, tilde));
+    std::string system(Trim(std::string_view(name).substr(0, tilde)));
     if (std::find(list.begin(), list.end(), system) == list.end()) list.push_back(system);
   }
   return list;
@@ -80,7 +68,7 @@ std::vector<std::string> LOAD_Zones_ComboBoxList(const std::string& appFolder, b
     if (tilde == std::string::npos) throw ZvError(1, "Error loading zones.", kSource);
     if (Trim(std::string_view(name).substr(0, tilde)) != coordinateSystem) continue;
     std::string flag = zones.value(name, inputSide ? "Show In" : "Show Out", "1");
-    if (FlagIsOne(flag, kSource)) list.push_back(Trim(std::string_view(name).substr(tilde + 1)));
+    if (FlagIsOne(flag, kSource)) list.emplace_back(Trim(std::string_view(name).substr(tilde + 1)));
   }
   return list;
 }
@@ -128,8 +116,8 @@ std::string FindZoneSection(const std::string& appFolder, const std::string& coo
     size_t tilde = name.find('~');
     if (tilde == std::string::npos) continue;
     std::string_view view(name);
-    if (SameName(Trim(view.substr(0, tilde)), Trim(coordinateSystem)) &&
-        SameName(Trim(view.substr(tilde + 1)), Trim(zone))) {
+    if (EqualsNoCase(Trim(view.substr(0, tilde)), Trim(coordinateSystem)) &&
+        EqualsNoCase(Trim(view.substr(tilde + 1)), Trim(zone))) {
       return name;
     }
   }

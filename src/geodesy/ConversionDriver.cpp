@@ -10,15 +10,11 @@
 #include "platform/Error.h"
 #include "platform/Numbers.h"
 #include "platform/Profile.h"
+#include "platform/Strings.h"
 
 namespace zv {
 
 namespace {
-
-std::string Trim(std::string_view s) {
-  size_t b = s.find_first_not_of(' '), e = s.find_last_not_of(' ');
-  return b == std::string_view::npos ? std::string() : std::string(s.substr(b, e - b + 1));
-}
 
 // A present length in another unit; false when a unit is unknown.
 bool ConvertLength(double& value, const std::string& from, const std::string& to) {
@@ -173,6 +169,23 @@ bool VerticalDatumTransformation(Ui& ui, const std::string& appFolder,
   return false;
 }
 
+namespace {
+
+// With a geoid height N, the missing one of the orthometric height H and the
+// ellipsoid height h: H = h - N, h = H + N.
+void FillMissingHeight(std::vector<SurveyPoint>& points) {
+  for (SurveyPoint& p : points) {
+    if (p.GeoidHeight == kNoValue) continue;
+    if (p.Elevation == kNoValue && p.EllipsoidHeight != kNoValue) {
+      p.Elevation = p.EllipsoidHeight - p.GeoidHeight;
+    } else if (p.EllipsoidHeight == kNoValue && p.Elevation != kNoValue) {
+      p.EllipsoidHeight = p.Elevation + p.GeoidHeight;
+    }
+  }
+}
+
+}  // namespace
+
 bool VerticalStep(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>& points,
                   const ConversionSettings& s) {
   if (s.inputVerticalDatum != s.outputVerticalDatum &&
@@ -180,7 +193,10 @@ bool VerticalStep(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>
                                    s.outputVerticalDatum)) {
     return false;
   }
-  if (s.OutputGeoid && !Geoid_Run(ui, appFolder, points, s.geoidModel)) return false;
+  if (s.OutputGeoid) {
+    if (!Geoid_Run(ui, appFolder, points, s.geoidModel)) return false;
+    FillMissingHeight(points);
+  }
   const std::string& to = s.outputVerticalUnits;
   for (SurveyPoint& p : points) {
     const std::string from = p.VerticalUnits;
@@ -284,9 +300,8 @@ std::string ReportInputPart(Ui& ui, const ConversionState& state) {
   const SurveyPoint& p = state.points.at(0);
   const ConversionSettings& s = state.settings;
   const std::tm now = state.now();
-  std::string r = std::string(kAppTitle) + " " + std::to_string(kVersionMajor) + "." +
-                  std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision) + "\t\t" +
-                  FormatDate(now) + " " + FormatTime(now) + "\r\n\r\nSingle Point Conversion";
+  std::string r = std::string(kTitleAndVersion) + "\t\t" + FormatDate(now) + " " + FormatTime(now) +
+                  "\r\n\r\nSingle Point Conversion";
   if (!p.PointName.empty()) r += "\t\tPoint Name: " + p.PointName;
   r += "\r\n\r\nInput:";
   SideLines(r, s.inputCoordinateSystem, s.inputZone, s.inputHorizontalDatum, s.inputVerticalDatum);

@@ -1,7 +1,7 @@
 #pragma once
 // The fixed Clarke 1866 table constants of the classical SPCS 27
 // plane-coordinate formulas (U.S. Coast and Geodetic Survey projection
-// tables), shared by the NAD 27 Transverse Mercator and Lambert forms.
+// tables) of the NAD 27 Lambert form.
 // Arcs in seconds, lengths in U.S. survey feet unless noted.
 
 #include <cmath>
@@ -9,11 +9,9 @@
 namespace zv::nad27 {
 
 inline constexpr double kE2 = 0.006768658;                 // e^2 of Clarke 1866
-inline constexpr double kEp2 = 0.0068147849;               // e'^2 of Clarke 1866
 inline constexpr double kFeetPerSecond = 101.2794065;      // rectified meridian arc
 inline constexpr double kSecondsPerFoot = 0.009873675553;  // 1 / 101.2794065
-inline constexpr double kEquatorMetersPerSecond = 30.92241724;
-inline constexpr double kSemimajorFeet = 20925832.16;  // a of Clarke 1866, feet
+inline constexpr double kSemimajorFeet = 20925832.16;      // a of Clarke 1866, feet
 
 // Seconds of rectified arc to subtract from phi'' (phi given by sin and cos):
 // omega'' = phi'' - (1052.893882 - (4.483344 - 0.02352 cos^2) cos^2) sin cos.

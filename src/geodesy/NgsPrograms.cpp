@@ -7,6 +7,7 @@
 #include "geodesy/Angles.h"
 #include "platform/Numbers.h"
 #include "platform/Process.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
@@ -90,11 +91,6 @@ constexpr Program kNadcon{"NADCON", "NGS/NADCON", "nadcon", "ndcon210",
 constexpr Program kVertcon{"VERTCON", "NGS/VERTCON", "vertcon", "vertcon",
                            "vertcon oht <vertcon.con >junk"};
 constexpr Program kGeoid{"GEOID", "NGS/GEOID", "geoid", "intg", "intg <geoid.con >junk"};
-
-std::string Trim(std::string_view s) {
-  size_t b = s.find_first_not_of(' '), e = s.find_last_not_of(' ');
-  return b == std::string_view::npos ? std::string() : std::string(s.substr(b, e - b + 1));
-}
 
 std::string_view Columns(std::string_view line, size_t first, size_t count) {
   if (line.size() < first) return {};
@@ -277,6 +273,46 @@ bool HeightInUnits(Ui& ui, const Program& p, const SurveyPoint& point, double me
   return false;
 }
 
+// Length of the UTF-8 sequence at text[i]; 0 when there is none.
+size_t Utf8Length(std::string_view text, size_t i) {
+  const auto c = static_cast<unsigned char>(text[i]);
+  size_t length = 0;
+  if (c < 0x80) return 1;
+  if (c >= 0xC2 && c <= 0xDF) {
+    length = 2;
+  } else if ((c & 0xF0) == 0xE0) {
+    length = 3;
+  } else if (c >= 0xF0 && c <= 0xF4) {
+    length = 4;
+  } else {
+    return 0;
+  }
+  if (i + length > text.size()) return 0;
+  for (size_t k = 1; k < length; ++k) {
+    if ((static_cast<unsigned char>(text[i + k]) & 0xC0) != 0x80) return 0;
+  }
+  return length;
+}
+
+// Catalog text as UTF-8: text that is not valid UTF-8 is read as Latin-1
+// (older catalogs hold the degree sign as the single byte 176).
+std::string AsUtf8(std::string_view text) {
+  size_t i = 0;
+  for (size_t length; i < text.size() && (length = Utf8Length(text, i)) != 0;) i += length;
+  if (i == text.size()) return std::string(text);
+  std::string utf8;
+  for (const char ch : text) {
+    const auto c = static_cast<unsigned char>(ch);
+    if (c < 0x80) {
+      utf8 += ch;
+    } else {
+      utf8 += static_cast<char>(0xC0 | (c >> 6));
+      utf8 += static_cast<char>(0x80 | (c & 0x3F));
+    }
+  }
+  return utf8;
+}
+
 std::vector<std::string> NadconControl(const NadconMethod& m) {
   std::vector<std::string> lines(4, "");
   switch (m.shift) {
@@ -330,8 +366,9 @@ const std::vector<std::string>& GeoidMethodNames() {
 bool Nadcon_Run(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>& points,
                 const std::string& method) {
   const auto& methods = NadconMethods();
+  const std::string name = AsUtf8(method);
   auto m = std::find_if(methods.begin(), methods.end(),
-                        [&](const NadconMethod& x) { return x.name == method; });
+                        [&](const NadconMethod& x) { return x.name == name; });
   if (m == methods.end()) {
     ui.exclaim("Unkown NADCON Conversion.", "Unkown NADCON Conversion");
     return false;
@@ -348,7 +385,8 @@ bool Nadcon_Run(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>& 
     std::optional<double> lat = ToNumber(Columns(line, 1, 14));
     std::optional<double> lon = ToNumber(Columns(line, 17, 14));
     if (!lat || !lon) continue;
-    std::optional<size_t> i = search.find(Trim(Columns(line, 41, std::string_view::npos)));
+    std::optional<size_t> i =
+        search.find(std::string(Trim(Columns(line, 41, std::string_view::npos))));
     if (!i) continue;
     SurveyPoint& p = points[*i];
     p.Latitude = Angles_ConvertHemisphere(*lat * kDegreesToRadians, "N", p.LatitudeHemisphere);
@@ -377,7 +415,8 @@ bool Vertcon_Run(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>&
     std::string_view line = lines[k];
     std::optional<double> shift = ToNumber(Columns(line, 33, 7));
     if (!shift) continue;
-    std::optional<size_t> i = search.find(Trim(Columns(line, 41, std::string_view::npos)));
+    std::optional<size_t> i =
+        search.find(std::string(Trim(Columns(line, 41, std::string_view::npos))));
     if (!i) continue;
     matched[*i] = true;
     SurveyPoint& p = points[*i];
@@ -413,7 +452,8 @@ bool Geoid_Run(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>& p
   for (const std::string& line : lines) {
     std::optional<double> height = ToNumber(Columns(line, 33, 8));
     if (!height) continue;
-    std::optional<size_t> i = search.find(Trim(Columns(line, 41, std::string_view::npos)));
+    std::optional<size_t> i =
+        search.find(std::string(Trim(Columns(line, 41, std::string_view::npos))));
     if (!i) continue;
     SurveyPoint& p = points[*i];
     double value = 0;
@@ -425,7 +465,7 @@ bool Geoid_Run(Ui& ui, const std::string& appFolder, std::vector<SurveyPoint>& p
   if (!AllMatched(ui, kGeoid, points, written, matched, run->diagnostics)) return false;
   if (request == model) return true;
 
-  const std::string source = Trim(request.size() > 8 ? request.substr(8, 7) : "");
+  const std::string source(Trim(request.size() > 8 ? request.substr(8, 7) : ""));
   if (source == "NAD 83") {
     for (SurveyPoint& p : points) {
       bool present = p.EllipsoidHeight != kNoValue && p.GeoidHeight != kNoValue;

@@ -27,10 +27,7 @@ ProjectionZone SetUpLambert1(const ZoneParameters& d) {
 }
 
 ProjectionZone SetUpTM27(const ZoneParameters& d) {
-  if (IsAlaska27Zone(d.a, d.e, d.phi0, d.lambda0, d.k0)) {
-    return Ok(AK27_SetZone(d.lambda0, d.falseNorthing, d.falseEasting), true);
-  }
-  return Ok(TM27_SetZone(d.a, d.e, d.phi0, d.lambda0, d.falseNorthing, d.falseEasting, d.k0), true);
+  return Ok(TM27_SetZone(d.phi0, d.lambda0, d.falseNorthing, d.falseEasting, d.k0), true);
 }
 
 ProjectionZone SetUpLambert2(const ZoneParameters& d) {
@@ -98,7 +95,6 @@ GridPoint Projection_GeographicToGrid(const ProjectionZone& zone, double phi, do
           },
           [&](const TmZone& z) { return TM_GeographicToGrid(z, phi, lambda); },
           [&](const Tm27Zone& z) { return TM27_GeographicToGrid(z, phi, lambda); },
-          [&](const Ak27Zone& z) { return AK27_GeographicToGrid(z, phi, lambda); },
           [&](const Lambert2Zone& z) { return Lambert2_GeographicToGrid(z, phi, lambda); },
           [&](const Lambert1Zone& z) { return Lambert1_GeographicToGrid(z, phi, lambda); },
           [&](const Lambert27Zone& z) { return Lambert27_GeographicToGrid(z, phi, lambda); },
@@ -119,7 +115,6 @@ GeographicPoint Projection_GridToGeographic(const ProjectionZone& zone, double n
           },
           [&](const TmZone& z) { return TM_GridToGeographic(z, northing, easting); },
           [&](const Tm27Zone& z) { return TM27_GridToGeographic(z, northing, easting); },
-          [&](const Ak27Zone& z) { return AK27_GridToGeographic(z, northing, easting); },
           [&](const Lambert2Zone& z) { return Lambert2_GridToGeographic(z, northing, easting); },
           [&](const Lambert1Zone& z) { return Lambert1_GridToGeographic(z, northing, easting); },
           [&](const Lambert27Zone& z) { return Lambert27_GridToGeographic(z, northing, easting); },

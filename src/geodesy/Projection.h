@@ -6,7 +6,6 @@
 
 #include <variant>
 
-#include "geodesy/AlaskaZones.h"
 #include "geodesy/Catalogs.h"
 #include "geodesy/Lambert.h"
 #include "geodesy/ObliqueMercator.h"
@@ -22,16 +21,15 @@ enum class ProjectionStatus {
 };
 
 struct ProjectionZone {
-  std::variant<std::monostate, TmZone, Tm27Zone, Ak27Zone, Lambert2Zone, Lambert1Zone,
-               Lambert27Zone, OmZone>
+  std::variant<std::monostate, TmZone, Tm27Zone, Lambert2Zone, Lambert1Zone, Lambert27Zone, OmZone>
       record;
   ProjectionStatus status = ProjectionStatus::UnknownProjection;
   // True for the NAD 27 forms: northings and eastings in U.S. survey feet.
   bool usSurveyFeet = false;
 };
 
-// Sets up the zone; a NAD 27 Transverse Mercator zone that is one of the
-// Alaska zones 2 to 9 (IsAlaska27Zone) gets the Alaska form.
+// Sets up the zone. Every NAD 27 Transverse Mercator zone, the Alaska zones
+// 2 to 9 included, takes the one NAD 27 form (Tm27Zone).
 ProjectionZone Projection_SetZone(const ZoneParameters& zone);
 
 // Forward and inverse of the zone's form. A zone whose status is not Ok, or

@@ -2,8 +2,6 @@
 
 #include <cmath>
 
-#include "geodesy/Nad27Tables.h"
-
 namespace zv {
 
 // ---- Transverse Mercator (NOAA Manual NOS NGS 5, TM equations) ----
@@ -134,132 +132,34 @@ GeographicPoint TM_GridToGeographic(const TmZone& z, double northing, double eas
   return p;
 }
 
-// ---- Transverse Mercator, NAD 27 equations (Clarke 1866 table constants) ----
+// ---- Transverse Mercator, NAD 27: Clarke 1866, U.S. survey feet ----
 
 namespace {
 
-using nad27::kE2;
-using nad27::kEp2;
-constexpr double kMetersToFeetEasting = 3.28083333;
-constexpr double kFeetToMetersInverse = 0.3048006099;
-
-double Cube(double x) {
-  return x * x * x;
-}
-
-// Latitude of the foot of the perpendicular, in seconds, for latitude p.
-double FootCorrection(double xPrime, double p) {
-  const double s = std::sin(p);
-  const double w = 1.0 - kE2 * s * s;
-  return 25.52381e-10 * xPrime * xPrime * w * w * std::tan(p);
-}
-
-// Convergence from the uncorrected longitude difference dL'' (positive east).
-double Tm27Convergence(double dL, double phi, double phi1) {
-  const double phim = (phi + phi1) / 2.0;
-  const double sm = std::sin(phim);
-  const double cm = std::cos(phim);
-  return kRadiansPerSecond * dL * (sm + 1.9587e-12 * dL * dL * sm * cm * cm);
-}
+constexpr double kClarke1866A = 6378206.4;
+constexpr double kClarke1866E = 0.08227185422300323;    // sqrt(a^2 - b^2) / a, b = 6356583.8
+constexpr double kUsFeetToMeters = 0.3048006096012192;  // 1200/3937
 
 }  // namespace
 
-Tm27Zone TM27_SetZone(double a, double e, double phi0, double lambda0, double N0, double E0,
-                      double k0) {
+Tm27Zone TM27_SetZone(double phi0, double lambda0, double N0, double E0, double k0) {
   Tm27Zone z;
-  z.a = a;
-  z.e = e;
+  z.tm = TM_SetZone(kClarke1866A, kClarke1866E, phi0, lambda0, 0.0, 0.0, k0);
   z.N0 = N0;
   z.E0 = E0;
-  z.k0 = k0;
-  z.lambda0Seconds = lambda0 * kSecondsPerRadian;
-
-  const double s = std::sin(phi0);
-  const double c = std::cos(phi0);
-  const double omega0 = phi0 * kSecondsPerRadian - nad27::RectifyReduction(s, c);
-  z.M0 = std::trunc(omega0 / 60.0);
-  z.S0 = omega0 - 60.0 * z.M0;
-
-  const double e2 = e * e;
-  const double w2 = 1.0 - e2 * s * s;
-  const double rho0 = kMetersToUsFeet * a * (1.0 - e2) / std::pow(w2, 1.5);
-  const double nu0 = kMetersToUsFeet * a / std::sqrt(w2);
-  z.C = 1e15 / (6.0 * rho0 * nu0 * k0 * k0);
   return z;
 }
 
-double TM27_ScaleFactor(const Tm27Zone& z, double phi, double easting) {
-  const double q = (easting - z.E0) / 1e6;
-  const double c = std::cos(phi);
-  const double f = 1.0 + kEp2 * c * c;
-  return z.k0 * (1.0 + q * q * f * f / (881.749162 * z.k0 * z.k0));
-}
-
 GridPoint TM27_GeographicToGrid(const Tm27Zone& z, double phi, double lambda) {
-  const double s = std::sin(phi);
-  const double c = std::cos(phi);
-
-  // F1: longitude difference, arc to sine.
-  const double dL = ReduceSecondsDifference(z.lambda0Seconds - lambda * kSecondsPerRadian);
-  const double dLc = dL - 3.9174 * Cube(dL / 1e4);
-
-  // F2, F3: easting.
-  double xp = nad27::kEquatorMetersPerSecond * c / std::sqrt(1.0 - kE2 * s * s) * dLc;
-  xp = xp + 4.0831 * Cube(xp / 1e5);
-  const double x = kMetersToFeetEasting * z.k0 * xp;
-
-  GridPoint g;
-  g.easting = z.E0 + x + z.C * Cube(x / 1e5);
-
-  // F4: foot of the perpendicular, two passes.
-  const double phiSeconds = phi * kSecondsPerRadian;
-  double phi1Seconds = phiSeconds + FootCorrection(xp, phi);
-  phi1Seconds = phiSeconds + FootCorrection(xp, phi1Seconds * kRadiansPerSecond);
-  const double phi1 = phi1Seconds * kRadiansPerSecond;
-
-  // F5, F6: northing from the rectified arc difference.
-  const double M1 = std::trunc(phi1Seconds / 60.0);
-  const double S1 = phi1Seconds - 60.0 * M1;
-  const double dOmega =
-      60.0 * (M1 - z.M0) + S1 - z.S0 - nad27::RectifyReduction(std::sin(phi1), std::cos(phi1));
-  g.northing = z.k0 * nad27::kFeetPerSecond * dOmega + z.N0;
-
-  g.scaleFactor = TM27_ScaleFactor(z, phi, g.easting);
-  g.convergence = Tm27Convergence(dL, phi, phi1);
+  GridPoint g = TM_GeographicToGrid(z.tm, phi, lambda);
+  g.northing = g.northing * kMetersToUsFeet + z.N0;
+  g.easting = g.easting * kMetersToUsFeet + z.E0;
   return g;
 }
 
 GeographicPoint TM27_GridToGeographic(const Tm27Zone& z, double northing, double easting) {
-  // I1, I2: easting without its cubic term, as meters on the ellipsoid.
-  const double x = easting - z.E0;
-  const double x1 = x - z.C * Cube(x / 1e5);
-  const double x2 = x - z.C * Cube(x1 / 1e5);
-  const double xp = kFeetToMetersInverse * x2 / z.k0;
-
-  // I3, I4: footpoint latitude.
-  const double omega1Seconds =
-      60.0 * z.M0 + z.S0 + nad27::kSecondsPerFoot * (northing - z.N0) / z.k0;
-  const double phi1Seconds =
-      omega1Seconds + nad27::InverseReduction(omega1Seconds * kRadiansPerSecond);
-  const double phi1 = phi1Seconds * kRadiansPerSecond;
-
-  // I5: latitude.
-  GeographicPoint p;
-  p.phi = (phi1Seconds - FootCorrection(xp, phi1)) * kRadiansPerSecond;
-
-  // I6 to I9: longitude.
-  const double xp1 = xp - 4.0831 * Cube(xp / 1e5);
-  const double xp2 = xp - 4.0831 * Cube(xp1 / 1e5);
-  const double s = std::sin(p.phi);
-  const double dL =
-      xp2 * std::sqrt(1.0 - kE2 * s * s) / (nad27::kEquatorMetersPerSecond * std::cos(p.phi));
-  const double dL1 = dL + 3.9174 * Cube(dL / 1e4);
-  const double dL2 = dL + 3.9174 * Cube(dL1 / 1e4);
-  p.lambda = NormalizeWestLongitude((z.lambda0Seconds - dL2) * kRadiansPerSecond);
-
-  p.scaleFactor = TM27_ScaleFactor(z, p.phi, easting);
-  p.convergence = Tm27Convergence(dL2, p.phi, phi1);  // I11: dL2 is lambda0'' - lambda''
-  return p;
+  return TM_GridToGeographic(z.tm, (northing - z.N0) * kUsFeetToMeters,
+                             (easting - z.E0) * kUsFeetToMeters);
 }
 
 }  // namespace zv

@@ -1,6 +1,6 @@
 #pragma once
 // Transverse Mercator: the SPCS 83 form for any ellipsoid (meters) and the
-// NAD 27 equations for Clarke 1866 (U.S. survey feet, arcs in seconds).
+// NAD 27 form, the same on Clarke 1866 in U.S. survey feet.
 // Set-up returns the zone record; the forward and inverse routines take it.
 // Angles are radians, latitude north-positive, longitude west-positive.
 
@@ -29,26 +29,25 @@ TmZone TM_SetZone(double a, double e, double phi0, double lambda0, double N0, do
 GridPoint TM_GeographicToGrid(const TmZone& zone, double phi, double lambda);
 GeographicPoint TM_GridToGeographic(const TmZone& zone, double northing, double easting);
 
-// "Transverse Mercator - NAD 27 Equations": the classical SPCS 27
-// plane-coordinate formulas with the fixed Clarke 1866 table constants.
-// Northing and easting in U.S. survey feet. The false northing is added to
-// the northing (zero for every SPCS 27 zone).
+// "Transverse Mercator - NAD 27 Equations" (the SPCS 27 zones, the Alaska
+// zones 2 to 9 among them): the Transverse Mercator above on the Clarke 1866
+// ellipsoid, fixed whatever the zone's ellipsoid, in meters and expressed in
+// U.S. survey feet (3937/1200 exactly). This agrees with a rigorous Clarke
+// 1866 computation within 0.6 mm over every zone's area of use, 4.8 degrees
+// from the central meridian at the most. (The classical plane-coordinate
+// equations carry the latitude of the foot of the perpendicular to second
+// order only and drift with the fourth power of the distance from the central
+// meridian: 24 mm at one degree, decimetres at the edges of the wider zones.)
 struct Tm27Zone {
-  double a = 0.0;  // meters, for the radii rho0 and nu0 only
-  double e = 0.0;
-  double lambda0Seconds = 0.0;  // lambda0'', west-positive
-  double N0 = 0.0;              // false northing, U.S. survey feet
-  double E0 = 0.0;              // false easting, U.S. survey feet
-  double k0 = 0.0;
-  double M0 = 0.0;  // rectified arc of phi0: whole minutes
-  double S0 = 0.0;  // ... and the remaining seconds
-  double C = 0.0;   // cubic easting coefficient
+  TmZone tm;        // the zone in meters on Clarke 1866, false origin zero
+  double N0 = 0.0;  // false northing, U.S. survey feet
+  double E0 = 0.0;  // false easting, U.S. survey feet
 };
 
-Tm27Zone TM27_SetZone(double a, double e, double phi0, double lambda0, double N0, double E0,
-                      double k0);
+// phi0 and lambda0 in radians (west-positive); false northing and easting in
+// U.S. survey feet.
+Tm27Zone TM27_SetZone(double phi0, double lambda0, double N0, double E0, double k0);
 GridPoint TM27_GeographicToGrid(const Tm27Zone& zone, double phi, double lambda);
 GeographicPoint TM27_GridToGeographic(const Tm27Zone& zone, double northing, double easting);
-double TM27_ScaleFactor(const Tm27Zone& zone, double phi, double easting);
 
 }  // namespace zv

@@ -6,6 +6,8 @@
 #include <istream>
 #include <ostream>
 
+#include "platform/Strings.h"
+
 namespace zv {
 
 namespace {
@@ -37,12 +39,10 @@ std::string WithLineBreaks(const std::string& text) {
   return out;
 }
 
+// The answer without blanks and line end, in lower case.
 std::string Lower(std::string s) {
-  std::transform(s.begin(), s.end(), s.begin(),
-                 [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-  while (!s.empty() && (s.back() == '\r' || s.back() == ' ' || s.back() == '\t')) s.pop_back();
-  size_t first = s.find_first_not_of(" \t");
-  return first == std::string::npos ? std::string() : s.substr(first);
+  while (!s.empty() && s.back() == '\r') s.pop_back();
+  return ToLower(Trim(s));
 }
 
 }  // namespace

@@ -4,40 +4,31 @@
 #include <cctype>
 #include <optional>
 
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
 
 namespace {
 
-std::string Trim(std::string_view s) {
-  size_t b = s.find_first_not_of(" \t");
-  if (b == std::string::npos) return {};
-  size_t e = s.find_last_not_of(" \t");
-  return std::string(s.substr(b, e - b + 1));
-}
-
-bool SameName(std::string_view a, std::string_view b) {
-  return a.size() == b.size() &&
-         std::equal(a.begin(), a.end(), b.begin(), [](unsigned char x, unsigned char y) {
-           return std::tolower(x) == std::tolower(y);
-         });
+std::string Trimmed(std::string_view s) {
+  return std::string(Trim(s));
 }
 
 // The section name of a "[name]" line.
 std::optional<std::string> SectionName(const std::string& line) {
-  std::string t = Trim(line);
+  std::string t = Trimmed(line);
   if (t.size() < 2 || t.front() != '[') return std::nullopt;
   size_t close = t.find(']');
   if (close == std::string::npos) return std::nullopt;
-  return Trim(t.substr(1, close - 1));
+  return Trimmed(t.substr(1, close - 1));
 }
 
 // The key of a "key=value" line.
 std::optional<std::string> KeyName(const std::string& line) {
   size_t eq = line.find('=');
   if (eq == std::string::npos) return std::nullopt;
-  return Trim(line.substr(0, eq));
+  return Trimmed(line.substr(0, eq));
 }
 
 struct Located {
@@ -56,7 +47,7 @@ Located Locate(const std::string& path, const std::string& section) {
       loc.sectionEnd = i;
       return loc;
     }
-    if (SameName(*name, section)) loc.sectionLine = i;
+    if (EqualsNoCase(*name, section)) loc.sectionLine = i;
   }
   loc.sectionEnd = loc.lines.size();
   return loc;
@@ -71,8 +62,8 @@ ProfileSnapshot::ProfileSnapshot(const std::string& path) {
     if (auto name = SectionName(line)) {
       sections_.push_back({*name, {}});
     } else if (auto key = KeyName(line); key && !sections_.empty()) {
-      sections_.back().keys.emplace_back(*key,
-                                         Trim(std::string_view(line).substr(line.find('=') + 1)));
+      sections_.back().keys.emplace_back(
+          *key, Trimmed(std::string_view(line).substr(line.find('=') + 1)));
     }
   }
 }
@@ -86,7 +77,7 @@ std::string ProfileSnapshot::value(std::string_view section, std::string_view ke
   const Section* s = find(section);
   if (!s) return defaultValue;
   for (const auto& [name, value] : s->keys) {
-    if (!SameName(name, key)) continue;
+    if (!EqualsNoCase(name, key)) continue;
     if (value.empty()) return defaultValue;
     return value.substr(0, kProfileValueLimit);
   }
@@ -95,7 +86,7 @@ std::string ProfileSnapshot::value(std::string_view section, std::string_view ke
 
 const ProfileSnapshot::Section* ProfileSnapshot::find(std::string_view section) const {
   for (const Section& s : sections_) {
-    if (SameName(s.name, section)) return &s;
+    if (EqualsNoCase(s.name, section)) return &s;
   }
   return nullptr;
 }
@@ -136,7 +127,7 @@ bool WriteProfileValue(const std::string& path, const std::string& section, cons
   Located loc = Locate(path, section);
   std::string newLine = key + "=" + value;
   if (!loc.sectionLine) {
-    if (!loc.lines.empty() && !Trim(loc.lines.back()).empty()) loc.lines.emplace_back();
+    if (!loc.lines.empty() && !Trimmed(loc.lines.back()).empty()) loc.lines.emplace_back();
     loc.lines.push_back("[" + section + "]");
     loc.lines.push_back(newLine);
     return WriteTextLines(path, loc.lines);
@@ -144,11 +135,11 @@ bool WriteProfileValue(const std::string& path, const std::string& section, cons
   size_t insertAt = *loc.sectionLine + 1;
   for (size_t i = *loc.sectionLine + 1; i < loc.sectionEnd; ++i) {
     auto name = KeyName(loc.lines[i]);
-    if (name && SameName(*name, key)) {
+    if (name && EqualsNoCase(*name, key)) {
       loc.lines[i] = newLine;
       return WriteTextLines(path, loc.lines);
     }
-    if (!Trim(loc.lines[i]).empty()) insertAt = i + 1;
+    if (!Trimmed(loc.lines[i]).empty()) insertAt = i + 1;
   }
   loc.lines.insert(loc.lines.begin() + static_cast<long>(insertAt), newLine);
   return WriteTextLines(path, loc.lines);

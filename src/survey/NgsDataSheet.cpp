@@ -6,6 +6,7 @@
 
 #include "geodesy/Angles.h"
 #include "platform/Error.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 
 namespace zv {
@@ -32,12 +33,6 @@ std::string_view From(std::string_view line, size_t first) {
 
 char Col(std::string_view line, size_t column) {
   return column <= line.size() ? line[column - 1] : '\0';
-}
-
-std::string_view Trim(std::string_view s) {
-  while (!s.empty() && s.front() == ' ') s.remove_prefix(1);
-  while (!s.empty() && s.back() == ' ') s.remove_suffix(1);
-  return s;
 }
 
 bool IsSheetStart(std::string_view line) {

@@ -13,6 +13,7 @@
 #endif
 
 #include "geodesy/Angles.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 #include "survey/SurveyFiles.h"
 
@@ -47,12 +48,6 @@ bool IsIntegerText(std::string_view token) {
   }
   if (digits.size() > 1 && digits.front() == '0') return false;
   return !(digits == "0" && token.size() > 1);
-}
-
-std::string_view Trim(std::string_view s) {
-  while (!s.empty() && s.front() == ' ') s.remove_prefix(1);
-  while (!s.empty() && s.back() == ' ') s.remove_suffix(1);
-  return s;
 }
 
 // Adds a word to a description kept as one tagged line.
@@ -407,8 +402,7 @@ class SrvWriter {
 
   void writeHeader(const FileHeader& header, const std::string& unitText) {
     if (!header.ProjectLine.empty()) out_.line("#" + header.ProjectLine);
-    out_.line(std::string("#VR:") + kAppTitle + " " + std::to_string(kVersionMajor) + "." +
-              std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision));
+    out_.line("#" + VersionLine());
     std::string_view extra = header.HeaderExtraLines;
     while (!extra.empty()) {
       size_t end = extra.find("\r\n");

@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "platform/Ui.h"
+#include "survey/SurveyIo.h"
 #include "survey/SurveyModel.h"
 
 namespace zv {
@@ -28,30 +29,5 @@ bool WriteProjectFile(Ui& ui, WorkArea& work, const std::string& path);
 bool ReadControlStream(Ui& ui, WorkArea& work, std::istream& in, const std::string& path);
 bool ReadPointsChainsStream(Ui& ui, WorkArea& work, std::istream& in, const std::string& path);
 bool ReadProjectStream(Ui& ui, WorkArea& work, std::istream& in, const std::string& path);
-
-// Opens an input file; a missing file shows "File Not Found", one that cannot
-// be opened "File Not Read". False after either message.
-bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in);
-
-// The message a writer shows when its output cannot be written.
-void ReportWriteFailure(Ui& ui, const std::string& path, const std::string& reason);
-
-// The points a writer had to change to fit its format, by reason; shown as
-// one "Check Output File" warning once the file is written.
-class OutputNotes {
- public:
-  // `reason` completes "n point(s) ...", e.g. "were taken as metres".
-  void add(std::string_view reason, const std::string& pointName);
-  bool empty() const { return notes_.empty(); }
-  void show(Ui& ui, const std::string& path) const;
-
- private:
-  struct Note {
-    std::string reason;
-    size_t count = 0;
-    std::vector<std::string> names;  // the first few
-  };
-  std::vector<Note> notes_;
-};
 
 }  // namespace zv

@@ -13,9 +13,6 @@
 #include <optional>
 #include <vector>
 
-#ifdef __linux__
-#endif
-
 #include "Version.h"
 #include "geodesy/Angles.h"
 #include "platform/Numbers.h"
@@ -103,11 +100,6 @@ bool HoldsData(const SurveyPoint& p) {
          p.ElevationError != kNoValueF || p.Latitude != kNoValue || p.Longitude != kNoValue ||
          p.EllipsoidHeight != kNoValue || p.GeoidHeight != kNoValue || p.Convergence != kNoValue ||
          p.ScaleFactor != kNoValue || p.HorizontalIsControl || p.ElevationIsControl;
-}
-
-void ReportReadFailure(Ui& ui, const std::string& path, const std::string& reason) {
-  ui.message("The file '" + path + "' could not be read." + std::string(kCrLf) + reason,
-             Icon::Exclamation, Buttons::Ok, "File Not Read");
 }
 
 class TaggedReader {
@@ -617,20 +609,6 @@ bool ReadTaggedStream(Ui& ui, WorkArea& work, std::istream& in, const std::strin
   return true;
 }
 
-bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in) {
-  if (!FileExists(path)) {
-    ui.message("The file '" + path + "' can not be found.", Icon::Exclamation, Buttons::Ok,
-               "File Not Found");
-    return false;
-  }
-  in.open(path, std::ios::binary);
-  if (!in) {
-    ReportReadFailure(ui, path, std::strerror(errno));
-    return false;
-  }
-  return true;
-}
-
 bool ReadTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const TaggedFormat& format) {
   std::ifstream in;
   if (!OpenSurveyInput(ui, path, in)) return false;
@@ -659,38 +637,6 @@ bool WriteTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const Tagg
   }
   writer.notes().show(ui, path);
   return true;
-}
-
-void ReportWriteFailure(Ui& ui, const std::string& path, const std::string& reason) {
-  ui.message("The file '" + path + "' could not be written." + std::string(kCrLf) + reason,
-             Icon::Exclamation, Buttons::Ok, "File Not Written");
-}
-
-void OutputNotes::add(std::string_view reason, const std::string& pointName) {
-  auto note =
-      std::find_if(notes_.begin(), notes_.end(), [&](const Note& n) { return n.reason == reason; });
-  if (note == notes_.end()) note = notes_.insert(notes_.end(), Note{std::string(reason), 0, {}});
-  if (note->names.size() < 5) note->names.push_back(pointName);
-  ++note->count;
-}
-
-void OutputNotes::show(Ui& ui, const std::string& path) const {
-  if (notes_.empty()) return;
-  std::string text = "The file '" + path + "' was written, but:";
-  for (const Note& n : notes_) {
-    text += std::string(kCrLf) + std::to_string(n.count) + " point(s) " + n.reason + ": ";
-    for (size_t i = 0; i < n.names.size(); ++i) {
-      if (i > 0) text += ", ";
-      text += "'" + n.names[i] + "'";
-    }
-    text += n.count > n.names.size() ? ", ..." : ".";
-  }
-  ui.exclaim(text, "Check Output File");
-}
-
-std::string VersionLine() {
-  return "VR:" + std::string(kAppTitle) + " " + std::to_string(kVersionMajor) + "." +
-         std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision);
 }
 
 std::string ChainListDate(std::int64_t unixTime) {

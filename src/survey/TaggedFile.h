@@ -91,8 +91,6 @@ bool ReadTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const Tagge
 // into the output points and the unit code into the output header.
 bool WriteTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const TaggedFormat& format);
 
-// "VR:" + application title + " " + major.minor.revision.
-std::string VersionLine();
 // The CP value for a local time: "mm/dd/yyyy h:mm:ss".
 std::string ChainListDate(std::int64_t unixTime);
 

@@ -11,6 +11,7 @@
 #endif
 
 #include "geodesy/Angles.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 #include "survey/SurveyFiles.h"
 
@@ -26,12 +27,6 @@ constexpr const char* kBenchMarks = "BENCH MARKS";
 std::string_view Cols(std::string_view line, size_t first, size_t last) {
   if (first > line.size()) return {};
   return line.substr(first - 1, last - first + 1);
-}
-
-std::string_view Trim(std::string_view s) {
-  while (!s.empty() && s.front() == ' ') s.remove_prefix(1);
-  while (!s.empty() && s.back() == ' ') s.remove_suffix(1);
-  return s;
 }
 
 void AppendTagged(std::string& field, std::string_view prefix, std::string_view value) {
@@ -254,8 +249,7 @@ class WsiWriter {
     out_.line("UL:" + header.HorizontalUnits);
     std::string version = TakeTaggedLine(extra, "VR:", true, true);
     if (version.empty()) {
-      version = std::string("VR:") + kAppTitle + " " + std::to_string(kVersionMajor) + "." +
-                std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision);
+      version = VersionLine();
     }
     out_.line(version);
     take(extra, "RE:");

@@ -7,6 +7,7 @@
 
 #include "geodesy/Angles.h"
 #include "platform/Error.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 #include "userformats/LineNoteUi.h"
 
@@ -19,13 +20,6 @@ constexpr int kMaxPosition = 32767;
 
 bool IsBlankText(std::string_view s) {
   return s.find_first_not_of(" \t") == std::string_view::npos;
-}
-
-std::string_view TrimBlanks(std::string_view s) {
-  size_t b = s.find_first_not_of(" \t");
-  if (b == std::string_view::npos) return {};
-  size_t e = s.find_last_not_of(" \t");
-  return s.substr(b, e - b + 1);
 }
 
 bool IsAngleFormat(const std::string& name) {
@@ -57,7 +51,7 @@ bool PrepareColumns(Ui& ui, const FlexInFormat& format, bool fixed,
     c.name = format.columns[r];
     c.column = FlexColumnFromName(c.name);
     if (fixed) {
-      std::string_view cell = r < format.order.size() ? TrimBlanks(format.order[r]) : "";
+      std::string_view cell = r < format.order.size() ? Trim(format.order[r]) : "";
       if (cell.empty()) {
         ui.exclaim("You must specify the column for '" + c.name + "'.", "Specify Column");
         return false;
@@ -134,7 +128,7 @@ bool FlexReader::single(float& target, const ReadColumn& c, std::string_view fie
 
 bool FlexReader::angle(double& target, const ReadColumn& c, std::string_view field, size_t lineNo) {
   if (!angles_) return true;  // plane coordinates: angle columns keep no value
-  std::string_view text = TrimBlanks(field);
+  std::string_view text = Trim(field);
   if (text.empty()) return true;
   try {
     // Out-of-range minutes or seconds: the parser reports and gives -99999.

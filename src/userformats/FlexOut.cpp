@@ -4,6 +4,7 @@
 
 #include "Version.h"
 #include "geodesy/Angles.h"
+#include "platform/Strings.h"
 #include "platform/TextIo.h"
 #include "survey/SurveyFiles.h"
 
@@ -13,13 +14,6 @@ namespace {
 
 constexpr int kMaxPosition = 32767;
 constexpr int kMaxDecimals = 15;
-
-std::string_view TrimBlanks(std::string_view s) {
-  size_t b = s.find_first_not_of(" \t");
-  if (b == std::string_view::npos) return {};
-  size_t e = s.find_last_not_of(" \t");
-  return s.substr(b, e - b + 1);
-}
 
 std::optional<int> WholeNumber(std::string_view cell, int low, int high) {
   int v = 0;
@@ -45,7 +39,7 @@ bool BuildColumns(Ui& ui, const FlexOutFormat& format, std::vector<FlexOutColumn
   for (size_t r = 0; r < format.columns.size(); ++r) {
     FlexOutColumn c;
     c.name = format.columns[r];
-    std::string_view cell = r < format.order.size() ? TrimBlanks(format.order[r]) : "";
+    std::string_view cell = r < format.order.size() ? Trim(format.order[r]) : "";
     if (cell.empty()) {
       ui.exclaim("You must specify the column for '" + c.name + "'.", "Specify Column");
       return false;
@@ -58,8 +52,7 @@ bool BuildColumns(Ui& ui, const FlexOutFormat& format, std::vector<FlexOutColumn
       return false;
     }
     c.position = *pos;
-    std::string_view places =
-        r < format.decimalPlaces.size() ? TrimBlanks(format.decimalPlaces[r]) : "";
+    std::string_view places = r < format.decimalPlaces.size() ? Trim(format.decimalPlaces[r]) : "";
     if (!places.empty()) {
       auto d = WholeNumber(places, 0, kMaxDecimals);
       if (!d) {
@@ -289,8 +282,7 @@ bool FlexOut(Ui& ui, WorkArea& work, const std::string& appFolder, const std::st
       out.line(p + text);
       ++lineNo;
     };
-    header("VR:" + std::string(kAppTitle) + " " + std::to_string(kVersionMajor) + "." +
-           std::to_string(kVersionMinor) + "." + std::to_string(kVersionRevision));
+    header(VersionLine());
     header("CM:" + HeaderTime(choices));
     header(choices.formatName.empty() ? "CM:FLEXED OUT USING UNDEFINED FORMAT"
                                       : "CM:FLEXED OUT USING " + choices.formatName);

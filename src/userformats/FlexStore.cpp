@@ -4,6 +4,7 @@
 #include <cctype>
 
 #include "platform/Profile.h"
+#include "platform/Strings.h"
 
 namespace zv {
 
@@ -136,13 +137,7 @@ bool FlexStore::checkFormat(Ui& ui, const std::string& name) const {
 
 bool FlexStore::hasFormat(const std::string& name) const {
   for (const auto& section : listFormats()) {
-    if (section.size() != name.size()) continue;
-    bool same = true;
-    for (size_t i = 0; i < name.size() && same; ++i) {
-      same = std::tolower(static_cast<unsigned char>(section[i])) ==
-             std::tolower(static_cast<unsigned char>(name[i]));
-    }
-    if (same) return true;
+    if (EqualsNoCase(section, name)) return true;
   }
   return false;
 }

@@ -304,9 +304,10 @@ TEST_F(BatchExchangeTest, GeographicRequestWithGeoidModel) {
   auto out = answer();
   ASSERT_EQ(out.size(), 13u);
   EXPECT_EQ(out[11], "GEOID09");
-  // On the central meridian: easting 500000, convergence 0, scale 0.9996.
+  // On the central meridian: easting 500000, convergence 0, scale 0.9996;
+  // the ellipsoid height is H + N.
   EXPECT_EQ(out[12].substr(out[12].find(",500000.0000,")),
-            ",500000.0000,1500.0000,,,,0.00000,0.99960000,-21.5000,,,");
+            ",500000.0000,1500.0000,,,,0.00000,0.99960000,-21.5000,,,1478.5000");
 }
 
 }  // namespace

@@ -162,6 +162,29 @@ TEST_F(ConversionDriverTest, VerticalTransformationsAndUnits) {
   EXPECT_DOUBLE_EQ(points[0].Elevation, 100.0 * 0.3048006096012192);
 }
 
+TEST_F(ConversionDriverTest, GeoidHeightsFillTheMissingHeight) {
+  test::InstallAllStandIns(app.path());
+  test::SaveGeoidGrid(
+      app.file("NGS/GEOID/g2009u05.bin"),
+      test::MakeGeoidGrid(40, 265, 0.25, 40, 40, [](double, double) { return -30.25; }));
+  std::vector<SurveyPoint> points(3, Geographic("P", 45 * kDeg, 90 * kDeg));
+  points[0].Elevation = 100.0;        // H: h = H + N
+  points[1].EllipsoidHeight = 100.0;  // h: H = h - N
+  points[2].Elevation = 1.0;          // both given: kept
+  points[2].EllipsoidHeight = 2.0;
+  ConversionSettings s;
+  s.inputVerticalDatum = s.outputVerticalDatum = "NAVD 88";
+  s.outputVerticalUnits = kMeters;
+  s.OutputGeoid = true;
+  s.geoidModel = "GEOID09";
+  ASSERT_TRUE(VerticalStep(ui, app.path(), points, s)) << ui.onlyText();
+  EXPECT_DOUBLE_EQ(points[0].EllipsoidHeight, 69.75);
+  EXPECT_DOUBLE_EQ(points[1].Elevation, 130.25);
+  EXPECT_EQ(points[2].Elevation, 1.0);
+  EXPECT_EQ(points[2].EllipsoidHeight, 2.0);
+  for (const SurveyPoint& p : points) EXPECT_EQ(p.GeoidHeight, -30.25);
+}
+
 TEST_F(ConversionDriverTest, ProjectsOverTheShippedZones) {
   // NGS SPCS83 example, New Mexico Central: N 142158.262, E 452489.852 m,
   // convergence -0 16 09.78, scale 0.99992783.
@@ -366,6 +389,7 @@ TEST_F(ConversionDriverTest, SinglePointReportGridToGeographicWithGeoid) {
             "     Vertical Datum: \t\tNAD 83 Ellipsoid\r\n"
             "     Latitude: \t\t\t45\xC2\xB0 00.00000' (N)\r\n"
             "     Longitude: \t\t90\xC2\xB0 00.00000' (W)\r\n"
+            "     Orthometric Height: \t6,662.566 (International Feet)\r\n"
             "     Geoid Height (GEOID09): \t-99.245 (International Feet)\r\n"
             "     Ellipsoid Height: \t\t6,563.320 (International Feet)");
 }

@@ -130,6 +130,9 @@ TEST_F(NgsRunTest, NadconMethodsPickTheAreaAndDirection) {
             with({"", "", "", "", "A", "WI", "", "Y"}));
   EXPECT_EQ(control("NADCON Texas HPGN to NAD 83 (1986) (West of 100\xC2\xB0 Longitude)"),
             with({"", "", "", "", "A", "WT", "", "N"}));
+  // Older catalogs hold the degree sign as the Latin-1 byte 176.
+  EXPECT_EQ(control("NADCON Texas HPGN to NAD 83 (1986) (East of 100\xB0 Longitude)"),
+            with({"", "", "", "", "A", "ET", "", "N"}));
   EXPECT_EQ(control("NADCON Alabama HPGN to NAD 83 (1996)"),
             with({"", "", "", "", "A", "AL", "", "N"}));
 
