@@ -15,7 +15,7 @@
 #include <iostream>
 
 #include "StandIn.h"
-#include "geodesy/NgsGrids.h"
+#include "ngs/NgsGrids.h"
 
 namespace zv::ngs {
 namespace {

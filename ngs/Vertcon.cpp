@@ -9,7 +9,7 @@
 #include <iostream>
 
 #include "StandIn.h"
-#include "geodesy/NgsGrids.h"
+#include "ngs/NgsGrids.h"
 
 namespace zv::ngs {
 namespace {

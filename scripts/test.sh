@@ -1,11 +1,12 @@
 #!/bin/sh
-# Installs what is missing, builds and runs every test: once normally and
+# Installs what is missing, builds and runs every test: once in a Release
+# build (with the scenario scripts on a private X server) and
 # once under AddressSanitizer and UndefinedBehaviorSanitizer.
 set -e
 cd "$(dirname "$0")/.."
 sh scripts/install-deps.sh
 JOBS=$(nproc)
-cmake -S . -B build -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
+cmake -S . -B build -G Ninja -DCMAKE_BUILD_TYPE=Release >/dev/null
 ninja -C build -j"$JOBS"
 (cd build && ctest --output-on-failure -j"$JOBS")
 cmake -S . -B build-asan -G Ninja -DCMAKE_BUILD_TYPE=Debug -DZV_SANITIZE=ON -DZV_BENCH=OFF -DZV_SCENARIOS=OFF >/dev/null

@@ -56,7 +56,7 @@ bool Translate(AppContext& ctx, const TranslationJob& job) {
                    "Unknown Routine");
     return false;
   }
-  return routine->run(ctx, call);
+  return RunShowingErrors(ctx.ui, [&] { return routine->run(ctx, call); });
 }
 
 }  // namespace zv

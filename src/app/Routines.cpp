@@ -1,8 +1,11 @@
 #include "app/Routines.h"
 
+#include <vector>
+
 #include "app/AppContext.h"
 #include "app/FileTypes.h"
 #include "app/ToolJobs.h"
+#include "platform/Error.h"
 #include "tools/SearchReplace.h"
 
 namespace zv {
@@ -31,28 +34,39 @@ bool ReplaceRoutine(AppContext& ctx, const RoutineCall& call) {
 
 namespace {
 
-// clang-format off
-constexpr Routine kUnattended[] = {
-    {"ConvertFile", ConvertFile},
-    {"Replace", ReplaceRoutine},
-    {"CoordConvert", CoordConvertRoutine},
-    {"CONVERT.EXE", ConvertToolRoutine},
-    {"PCPT2PI.EXE", Pcpt2PiToolRoutine},
-    {"PI2PCPT.EXE", Pi2PcptToolRoutine},
-    {"EXTRACT.EXE", ExtractToolRoutine},
-    {"LLEV.EXE", LlevToolRoutine},
-    {"SORT.EXE", SortToolRoutine},
-};
-// clang-format on
+std::vector<Routine> MakeUnattendedRoutines() {
+  std::vector<Routine> routines = {
+      {"ConvertFile", ConvertFile},
+      {"Replace", ReplaceRoutine},
+      {"CoordConvert", CoordConvertRoutine},
+  };
+  for (const ToolRoutine& tool : ToolRoutines())
+    if (tool.unattended) routines.push_back({tool.program, nullptr, &tool});
+  return routines;
+}
 
 }  // namespace
 
-std::span<const Routine> UnattendedRoutines() {
-  return kUnattended;
+bool RunShowingErrors(Ui& ui, const std::function<bool()>& routine) {
+  try {
+    return routine();
+  } catch (const ZvError& e) {
+    ui.setBusy(false);
+    ui.exclaim(e.description(), e.source());
+  } catch (const std::exception& e) {
+    ui.setBusy(false);
+    ui.exclaim(std::string("The translation stopped: ") + e.what());
+  }
+  return false;
+}
+
+bool Routine::run(AppContext& ctx, const RoutineCall& call) const {
+  return tool ? RunToolUnattended(ctx, *tool, call) : fn(ctx, call);
 }
 
 const Routine* FindUnattendedRoutine(std::string_view program) {
-  for (const auto& r : kUnattended)
+  static const std::vector<Routine> kRoutines = MakeUnattendedRoutines();
+  for (const auto& r : kRoutines)
     if (r.program == program) return &r;
   return nullptr;
 }

@@ -2,13 +2,14 @@
 // The routine table: each Program name of a translation definition with the
 // routine that carries it out. Both dispatchers use it.
 
-#include <span>
+#include <functional>
 #include <string>
 #include <string_view>
 
 namespace zv {
 
 struct AppContext;
+class Ui;
 
 // What a routine is called with.
 struct RoutineCall {
@@ -21,14 +22,23 @@ struct RoutineCall {
 };
 
 using RoutineFn = bool (*)(AppContext&, const RoutineCall&);
+struct ToolRoutine;
 
+// A routine of the unattended dispatcher: one of its own or an external tool.
 struct Routine {
   std::string_view program;
-  RoutineFn run;  // true when the routine did its job
+  RoutineFn fn = nullptr;
+  const ToolRoutine* tool = nullptr;
+  // True when the routine did its job.
+  bool run(AppContext& ctx, const RoutineCall& call) const;
 };
 
-std::span<const Routine> UnattendedRoutines();
+// The unattended dispatcher's routines, then the tools it offers.
 const Routine* FindUnattendedRoutine(std::string_view program);
+
+// Runs a routine of either dispatcher. An error raised below it ends the run
+// here, where it is shown (the busy pointer off first); false then.
+bool RunShowingErrors(Ui& ui, const std::function<bool()>& routine);
 
 // Reads the input with its type's reader and writes it with the output
 // type's writer. A reader that fails ends the run.

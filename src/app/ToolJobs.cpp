@@ -256,47 +256,93 @@ std::optional<double> AskLlevLimit(Ui& ui) {
   return number;
 }
 
-// --- Routines of the unattended dispatcher ---
+namespace {
 
-bool ConvertToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  ToolPlace place = PintrelPlace(ctx.appFolder);
-  if (!ConvertToolJob(ctx.ui, call.inputPath, call.outputPath, call.configurationPath, place)) {
-    return false;
+// clang-format off
+constexpr ToolRoutine kToolRoutines[] = {
+    {"CONVERT.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers&, const ToolPlace& p) {
+       return ConvertToolJob(ui, c.inputPath, c.outputPath, c.configurationPath, p); },
+     true, ToolQuestion::None, ToolReport::NoMatchCodes, true},
+    {"PCPT2PI.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers&, const ToolPlace& p) {
+       return Pcpt2PiToolJob(ui, c.inputPath, c.outputPath, p); },
+     false, ToolQuestion::None, ToolReport::None, true},
+    {"PI2PCPT.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers&, const ToolPlace& p) {
+       return Pi2PcptToolJob(ui, c.inputPath, c.outputPath, p); },
+     false, ToolQuestion::None, ToolReport::None, true},
+    {"EXTRACT.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers& a, const ToolPlace& p) {
+       return ExtractToolJob(ui, c.inputPath, c.outputPath, c.configurationPath, a.anyMatch, p); },
+     true, ToolQuestion::AnyMatch, ToolReport::None, true},
+    {"LLEV.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers& a, const ToolPlace& p) {
+       return LlevToolJob(ui, c.inputPath, c.outputPath, a.upperLimit, p); },
+     false, ToolQuestion::UpperLimit, ToolReport::None, true},
+    {"SORT.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers&, const ToolPlace& p) {
+       return SortToolJob(ui, c.inputPath, c.outputPath, p); },
+     false, ToolQuestion::None, ToolReport::FreePointNumbers, true},
+    {"CTL2ARE.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers&, const ToolPlace& p) {
+       return Ctl2AreToolJob(ui, c.inputPath, c.outputPath, p); },
+     false, ToolQuestion::None, ToolReport::None, false},
+    {"ALI2FLA.EXE", [](Ui& ui, const RoutineCall& c, const ToolAnswers&, const ToolPlace& p) {
+       return Ali2FlaToolJob(ui, c.inputPath, c.outputPath, p); },
+     false, ToolQuestion::None, ToolReport::None, false},
+};
+// clang-format on
+
+}  // namespace
+
+std::span<const ToolRoutine> ToolRoutines() {
+  return kToolRoutines;
+}
+
+const ToolRoutine* FindToolRoutine(std::string_view program) {
+  for (const auto& t : kToolRoutines)
+    if (t.program == program) return &t;
+  return nullptr;
+}
+
+bool AskToolQuestion(Ui& ui, const ToolRoutine& tool, ToolAnswers& answers) {
+  switch (tool.question) {
+    case ToolQuestion::None:
+      return true;
+    case ToolQuestion::AnyMatch:
+      answers.anyMatch = AskAnyMatch(ui);
+      return true;
+    case ToolQuestion::UpperLimit: {
+      const std::optional<double> limit = AskLlevLimit(ui);
+      answers.upperLimit = limit.value_or(0.0);
+      return limit.has_value();
+    }
   }
-  const std::string report = ConvertReportPath(place);
-  if (FileExists(report)) {
-    ctx.ui.inform(kNoMatchText);
-    ctx.ui.viewText(report, "Out File (*.OUT)");
+  return false;
+}
+
+std::string ToolReportPath(const ToolRoutine& tool, const ToolPlace& place) {
+  switch (tool.report) {
+    case ToolReport::None:
+      return {};
+    case ToolReport::NoMatchCodes:
+      return ConvertReportPath(place);
+    case ToolReport::FreePointNumbers:
+      return SortReportPath(place);
   }
-  return true;
+  return {};
 }
 
-bool Pcpt2PiToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  return Pcpt2PiToolJob(ctx.ui, call.inputPath, call.outputPath, PintrelPlace(ctx.appFolder));
+const char* ToolReportType(const ToolRoutine& tool) {
+  return tool.report == ToolReport::FreePointNumbers ? "Available Point Numbers"
+                                                     : "Out File (*.OUT)";
 }
 
-bool Pi2PcptToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  return Pi2PcptToolJob(ctx.ui, call.inputPath, call.outputPath, PintrelPlace(ctx.appFolder));
-}
-
-bool ExtractToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  bool anyMatch = AskAnyMatch(ctx.ui);
-  return ExtractToolJob(ctx.ui, call.inputPath, call.outputPath, call.configurationPath, anyMatch,
-                        PintrelPlace(ctx.appFolder));
-}
-
-bool LlevToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  std::optional<double> limit = AskLlevLimit(ctx.ui);
-  if (!limit) return false;
-  return LlevToolJob(ctx.ui, call.inputPath, call.outputPath, *limit, PintrelPlace(ctx.appFolder));
-}
-
-bool SortToolRoutine(AppContext& ctx, const RoutineCall& call) {
-  ToolPlace place = PintrelPlace(ctx.appFolder);
-  if (!SortToolJob(ctx.ui, call.inputPath, call.outputPath, place)) return false;
-  const std::string report = SortReportPath(place);
-  if (FileExists(report)) {
-    ctx.ui.viewText(report, "Available Point Numbers");
+bool RunToolUnattended(AppContext& ctx, const ToolRoutine& tool, const RoutineCall& call) {
+  ToolAnswers answers;
+  if (!AskToolQuestion(ctx.ui, tool, answers)) return false;
+  const ToolPlace place = PintrelPlace(ctx.appFolder);
+  if (!tool.job(ctx.ui, call, answers, place)) return false;
+  const std::string report = ToolReportPath(tool, place);
+  if (report.empty() || !FileExists(report)) return true;
+  if (tool.report == ToolReport::NoMatchCodes) ctx.ui.inform(kNoMatchText);
+  ctx.ui.viewText(report, ToolReportType(tool));
+  // The list of free numbers is removed once seen; the unmatched codes stay.
+  if (tool.report == ToolReport::FreePointNumbers) {
     std::error_code ec;
     fs::remove(report, ec);
   }

@@ -8,7 +8,9 @@
 // creating the empty output file or the job file are reported the same way.
 
 #include <optional>
+#include <span>
 #include <string>
+#include <string_view>
 
 #include "app/Routines.h"
 #include "platform/Ui.h"
@@ -71,14 +73,41 @@ inline constexpr const char* kNoMatchText = "The following codes had no match.";
 bool AskAnyMatch(Ui& ui);
 std::optional<double> AskLlevLimit(Ui& ui);
 
-// Routines of the unattended dispatcher (tools in appFolder/Pintrel,
-// window at 0, 0), with their questions and report files.
-bool ConvertToolRoutine(AppContext& ctx, const RoutineCall& call);
-bool Pcpt2PiToolRoutine(AppContext& ctx, const RoutineCall& call);
-bool Pi2PcptToolRoutine(AppContext& ctx, const RoutineCall& call);
-bool ExtractToolRoutine(AppContext& ctx, const RoutineCall& call);
-bool LlevToolRoutine(AppContext& ctx, const RoutineCall& call);
-bool SortToolRoutine(AppContext& ctx, const RoutineCall& call);
+// The external tools a definition's Program can name, one row each; both
+// dispatchers run them from this table.
+enum class ToolQuestion { None, AnyMatch, UpperLimit };
+enum class ToolReport { None, NoMatchCodes, FreePointNumbers };
+
+struct ToolAnswers {
+  bool anyMatch = false;
+  double upperLimit = 0.0;
+};
+
+using ToolJobFn = bool (*)(Ui&, const RoutineCall&, const ToolAnswers&, const ToolPlace&);
+
+struct ToolRoutine {
+  std::string_view program;  // also the tool's file name
+  ToolJobFn job;
+  bool configuration;  // takes the configuration file
+  ToolQuestion question;
+  ToolReport report;
+  bool unattended;  // offered by the unattended dispatcher as well as the window
+};
+
+std::span<const ToolRoutine> ToolRoutines();
+const ToolRoutine* FindToolRoutine(std::string_view program);
+
+// Asks the routine's question before the tool runs; false when the answer
+// stops the run.
+bool AskToolQuestion(Ui& ui, const ToolRoutine& tool, ToolAnswers& answers);
+// The report file a routine's tool leaves, and the type it is shown with;
+// empty for none.
+std::string ToolReportPath(const ToolRoutine& tool, const ToolPlace& place);
+const char* ToolReportType(const ToolRoutine& tool);
+
+// The unattended run of a tool (Pintrel of the application folder, console
+// at 0, 0): question, job, and its report shown in a viewer.
+bool RunToolUnattended(AppContext& ctx, const ToolRoutine& tool, const RoutineCall& call);
 
 // The batch coordinate conversion through tccin.tmp and tccout.tmp of the
 // application folder.

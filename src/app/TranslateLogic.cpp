@@ -247,16 +247,7 @@ bool TranslateLogic::translate() {
   if (const WindowRoutine* routine = FindWindowRoutine(program)) {
     WindowRun run{ctx_, call, storeDefault && configuration.enabled, runLong_,
                   frame_ ? ConsoleBelow(frame_()) : ConsolePlace{}};
-    // An error raised below a routine ends the run here, where it is shown.
-    try {
-      done = routine->run(run);
-    } catch (const ZvError& e) {
-      ctx_.ui.setBusy(false);
-      ctx_.ui.exclaim(e.description(), e.source());
-    } catch (const std::exception& e) {
-      ctx_.ui.setBusy(false);
-      ctx_.ui.exclaim(std::string("The translation stopped: ") + e.what());
-    }
+    done = RunShowingErrors(ctx_.ui, [&] { return routine->run(run); });
   } else {
     ctx_.ui.setBusy(false);
     ctx_.ui.exclaim("Could not perform translation.");

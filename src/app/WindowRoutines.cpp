@@ -1,6 +1,7 @@
 #include "app/WindowRoutines.h"
 
 #include <filesystem>
+#include <vector>
 
 #include "app/AppContext.h"
 #include "app/ToolJobs.h"
@@ -42,7 +43,7 @@ bool RunReplace(WindowRun& run) {
   return true;
 }
 
-// The window has no console position of its own yet: tools open at 0, 0.
+// The tools' console opens centred below the window.
 ToolPlace PlaceOf(const WindowRun& run) {
   return PintrelPlace(run.ctx.appFolder, run.console.left, run.console.top);
 }
@@ -56,103 +57,57 @@ void ShowAndDeleteReport(Ui& ui, const std::string& path, const std::string& typ
 }
 
 // A tool failing to run has shown its own message; no completion follows.
-bool RunConvertTool(WindowRun& run) {
-  if (!CheckConfiguration(run)) return false;
-  const RoutineCall& c = run.call;
+bool RunTool(WindowRun& run, const ToolRoutine& tool) {
+  if (tool.configuration && !CheckConfiguration(run)) return false;
+  ToolAnswers answers;
+  if (!AskToolQuestion(run.ctx.ui, tool, answers)) return false;
   const ToolPlace place = PlaceOf(run);
-  if (!RunLong(run, [&] {
-        return ConvertToolJob(run.ctx.ui, c.inputPath, c.outputPath, c.configurationPath, place);
-      })) {
-    return false;
+  if (!RunLong(run, [&] { return tool.job(run.ctx.ui, run.call, answers, place); })) return false;
+  const std::string report = ToolReportPath(tool, place);
+  switch (tool.report) {
+    case ToolReport::None:
+      Complete(run, kTranslationComplete, kAppTitle);
+      return true;
+    case ToolReport::NoMatchCodes:
+      if (!FileExists(report)) {
+        Complete(run, kTranslationComplete, kAppTitle);
+        return true;
+      }
+      run.ctx.ui.setBusy(false);
+      run.ctx.ui.inform(kNoMatchText);
+      ShowAndDeleteReport(run.ctx.ui, report, ToolReportType(tool));
+      return true;
+    case ToolReport::FreePointNumbers:
+      if (!FileExists(report)) {
+        run.ctx.ui.setBusy(false);
+        run.ctx.ui.inform("The Translation appears to have failed.");
+        return false;
+      }
+      Complete(run, kTranslationComplete, kAppTitle);
+      ShowAndDeleteReport(run.ctx.ui, report, ToolReportType(tool));
+      return true;
   }
-  const std::string report = ConvertReportPath(place);
-  if (FileExists(report)) {
-    run.ctx.ui.setBusy(false);
-    run.ctx.ui.inform(kNoMatchText);
-    ShowAndDeleteReport(run.ctx.ui, report, "Out File (*.OUT)");
-  } else {
-    Complete(run, kTranslationComplete, kAppTitle);
-  }
-  return true;
+  return false;
 }
 
-using TwoPathToolJob = bool (*)(Ui&, const std::string&, const std::string&, const ToolPlace&);
-
-template <TwoPathToolJob job>
-bool RunTwoPathTool(WindowRun& run) {
-  const RoutineCall& c = run.call;
-  if (!RunLong(run, [&] { return job(run.ctx.ui, c.inputPath, c.outputPath, PlaceOf(run)); })) {
-    return false;
-  }
-  Complete(run, kTranslationComplete, kAppTitle);
-  return true;
+std::vector<WindowRoutine> MakeWindowRoutines() {
+  std::vector<WindowRoutine> routines = {
+      {"ConvertFile", RunConvertFile},
+      {"Replace", RunReplace},
+  };
+  for (const ToolRoutine& tool : ToolRoutines()) routines.push_back({tool.program, nullptr, &tool});
+  return routines;
 }
-
-bool RunExtractTool(WindowRun& run) {
-  if (!CheckConfiguration(run)) return false;
-  const bool anyMatch = AskAnyMatch(run.ctx.ui);
-  const RoutineCall& c = run.call;
-  if (!RunLong(run, [&] {
-        return ExtractToolJob(run.ctx.ui, c.inputPath, c.outputPath, c.configurationPath, anyMatch,
-                              PlaceOf(run));
-      })) {
-    return false;
-  }
-  Complete(run, kTranslationComplete, kAppTitle);
-  return true;
-}
-
-bool RunLlevTool(WindowRun& run) {
-  const std::optional<double> limit = AskLlevLimit(run.ctx.ui);
-  if (!limit) return false;
-  const RoutineCall& c = run.call;
-  if (!RunLong(run, [&] {
-        return LlevToolJob(run.ctx.ui, c.inputPath, c.outputPath, *limit, PlaceOf(run));
-      })) {
-    return false;
-  }
-  Complete(run, kTranslationComplete, kAppTitle);
-  return true;
-}
-
-bool RunSortTool(WindowRun& run) {
-  const RoutineCall& c = run.call;
-  const ToolPlace place = PlaceOf(run);
-  if (!RunLong(run, [&] { return SortToolJob(run.ctx.ui, c.inputPath, c.outputPath, place); })) {
-    return false;
-  }
-  const std::string report = SortReportPath(place);
-  if (!FileExists(report)) {
-    run.ctx.ui.setBusy(false);
-    run.ctx.ui.inform("The Translation appears to have failed.");
-    return false;
-  }
-  Complete(run, kTranslationComplete, kAppTitle);
-  ShowAndDeleteReport(run.ctx.ui, report, "Available Point Numbers");
-  return true;
-}
-
-constexpr WindowRoutine kWindowRoutines[] = {
-    {"CONVERT.EXE", RunConvertTool},
-    {"PCPT2PI.EXE", RunTwoPathTool<Pcpt2PiToolJob>},
-    {"PI2PCPT.EXE", RunTwoPathTool<Pi2PcptToolJob>},
-    {"EXTRACT.EXE", RunExtractTool},
-    {"LLEV.EXE", RunLlevTool},
-    {"SORT.EXE", RunSortTool},
-    {"CTL2ARE.EXE", RunTwoPathTool<Ctl2AreToolJob>},
-    {"ALI2FLA.EXE", RunTwoPathTool<Ali2FlaToolJob>},
-    {"ConvertFile", RunConvertFile},
-    {"Replace", RunReplace},
-};
 
 }  // namespace
 
-std::span<const WindowRoutine> WindowRoutines() {
-  return kWindowRoutines;
+bool WindowRoutine::run(WindowRun& r) const {
+  return tool ? RunTool(r, *tool) : fn(r);
 }
 
 const WindowRoutine* FindWindowRoutine(std::string_view program) {
-  for (const auto& r : kWindowRoutines)
+  static const std::vector<WindowRoutine> kRoutines = MakeWindowRoutines();
+  for (const auto& r : kRoutines)
     if (r.program == program) return &r;
   return nullptr;
 }

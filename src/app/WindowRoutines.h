@@ -33,12 +33,16 @@ struct WindowRun {
 
 using WindowRoutineFn = bool (*)(WindowRun&);
 
+// A routine of the window: one of its own or an external tool.
 struct WindowRoutine {
   std::string_view program;
-  WindowRoutineFn run;  // true when the routine did its job
+  WindowRoutineFn fn = nullptr;
+  const ToolRoutine* tool = nullptr;
+  // True when the routine did its job.
+  bool run(WindowRun& run) const;
 };
 
-std::span<const WindowRoutine> WindowRoutines();
+// The window's routines, then the external tools.
 const WindowRoutine* FindWindowRoutine(std::string_view program);
 
 // The check made by the routines that take a configuration file; stores the

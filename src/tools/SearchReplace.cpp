@@ -5,11 +5,11 @@
 #include <fstream>
 
 #include "geodesy/Angles.h"
+#include "platform/ForwardingUi.h"
 #include "platform/Numbers.h"
 #include "platform/TextIo.h"
 #include "survey/SurveyFiles.h"
 #include "survey/SurveyModel.h"
-#include "userformats/LineNoteUi.h"
 
 namespace zv {
 

@@ -7,9 +7,9 @@
 
 #include "geodesy/Angles.h"
 #include "platform/Error.h"
+#include "platform/ForwardingUi.h"
 #include "platform/Strings.h"
 #include "platform/TextIo.h"
-#include "userformats/LineNoteUi.h"
 
 namespace zv {
 

@@ -1,6 +1,11 @@
+// The catalogue of translation definitions and the unattended dispatcher.
+
 #include <gtest/gtest.h>
 
+#include <filesystem>
+
 #include "app/AppContext.h"
+#include "app/Catalogue.h"
 #include "app/Dispatcher.h"
 #include "platform/ScriptedUi.h"
 #include "support/TempDir.h"
@@ -13,77 +18,122 @@ using test::ReadFile;
 
 const std::string kCtl = "VORN Control Files (*.CTL)";
 const std::string kPac = "VORN Points and Chains Files (*.PAC)";
+const std::string kPrj = "VORN Project Files (*.PRJ)";
 
-const std::string kControl =
-    CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0", "ZC:300.5", "PD:IRON PIN", "AC:OS",
-          "PN:CP2", "YC:1100.25", "XC:2050.75", "ZC:301.0"});
+class CatalogueTest : public ::testing::Test {
+ protected:
+  std::string def(const std::string& name, const std::vector<std::string>& lines) {
+    return dir.write("UTIFiles/" + name + ".uti", CrLf(lines));
+  }
+  test::TempDir dir;
+  Catalogue cat;
+};
 
-class DispatcherTest : public ::testing::Test {
+TEST_F(CatalogueTest, QueriesKeepCatalogueOrderAndLastMatchWins) {
+  def("a", {"ConvertFile", "Copy", kCtl, kCtl});
+  def("b", {"ConvertFile", "To PAC", kCtl, kPac, "CODES.TRN"});
+  def("c", {"Replace", "To PAC", kCtl, kPac, "/filters/x.trn"});
+  def("d", {"ConvertFile", "Back", kPac, kCtl});
+  def("short", {"ConvertFile", "Broken", kCtl});
+  dir.write("UTIFiles/notes.txt", "not a definition\r\n");
+  ASSERT_TRUE(cat.load(dir.path()));
+  ASSERT_EQ(cat.definitions().size(), 4u);
+  // A bare configuration name is taken from TRNFiles.
+  EXPECT_EQ(cat.definitions()[1].ConfigFile, dir.path() + "/TRNFiles/CODES.TRN");
+  EXPECT_EQ(cat.definitions()[0].ConfigFile, "");
+
+  EXPECT_EQ(cat.query("Input"), kCtl + "|" + kCtl + "|" + kCtl + "|" + kPac + "|");
+  EXPECT_EQ(cat.query("Output", kCtl), kCtl + "|" + kPac + "|" + kPac + "|");
+  EXPECT_EQ(cat.query("Action", kCtl, kPac), "To PAC|To PAC|");
+  EXPECT_EQ(cat.query("Action", kCtl, kPrj), "");
+  EXPECT_EQ(cat.query("input"), "");  // keywords are case-sensitive
+
+  // Two definitions equal in the three fields: the later one runs.
+  EXPECT_EQ(cat.query("ConfigFile", kCtl, kPac, "To PAC"), "/filters/x.trn");
+  EXPECT_EQ(cat.query("Program", kCtl, kPac, "To PAC"), "Replace");
+  EXPECT_EQ(cat.currentIndex(), 2);
+  EXPECT_EQ(cat.query("Program", kCtl, kPrj, "To PAC"), "");
+  EXPECT_EQ(cat.currentIndex(), 2);  // a failed query leaves the current one
+
+  // Nothing chosen yet: the first definition is the last used one.
+  Catalogue fresh;
+  ASSERT_TRUE(fresh.load(dir.path()));
+  ASSERT_TRUE(fresh.writeLastUsed(dir.path()));
+  EXPECT_EQ(ReadFile(dir.file("Quorvane.cfg")), dir.file("UTIFiles/a.uti") + "\r\n");
+}
+
+TEST_F(CatalogueTest, DefaultPathProposesTheStemOnlyWhenTheFileExists) {
+  const std::string folder = dir.path() + "/";
+  dir.write("JOB7.CTL", "AC:PR\r\n");
+  dir.write("job8.pac", "AC:PR\r\n");
+  const std::tuple<const char*, std::string, std::string> cases[] = {
+      {"JOB7", kCtl, folder + "JOB7.CTL"},
+      {"JOB7", kPrj, folder},
+      {"job8", kPac, folder + "job8.pac"},
+      {"JOB8", kPac, folder},
+  };
+  for (const auto& [stem, type, expected] : cases) {
+    EXPECT_EQ(DefaultPath(folder, stem, type), expected) << stem << " " << type;
+  }
+  EXPECT_EQ(TypeExtension(kPrj), ".PRJ");
+}
+
+class DispatcherTest : public CatalogueTest {
  protected:
   DispatcherTest() : ctx(ui, dir.path()) {
-    dir.write("UTIFiles/CTL2PAC.uti", CrLf({"ConvertFile", "To PAC", kCtl, kPac}));
-    dir.write("UTIFiles/CTL2PRJ.uti",
-              CrLf({"ConvertFile", "To PRJ", kCtl, "VORN Project Files (*.PRJ)"}));
-    dir.write("UTIFiles/ODD.uti", CrLf({"Frobnicate", "Odd", kCtl, kPac}));
-    dir.write("UTIFiles/SHORT.uti", CrLf({"ConvertFile", "Short"}));
-    dir.write("UTIFiles/BARE.uti",
-              CrLf({"ConvertFile", "To PAC", kCtl, kPac, "NO-SUCH-CODES.TRN"}));
-    input = dir.write("job.ctl", kControl);
-    output = dir.file("job.pac");
+    def("CTL2PAC", {"ConvertFile", "To PAC", kCtl, kPac});
+    def("CTL2PRJ", {"ConvertFile", "To PRJ", kCtl, kPrj});
+    def("ODD", {"Frobnicate", "Odd", kCtl, kPac});
+    def("SHORT", {"ConvertFile", "Short"});
+    def("BARE", {"ConvertFile", "To PAC", kCtl, kPac, "NO-SUCH-CODES.TRN"});
   }
   bool run(const std::string& def, const std::string& in, const std::string& out,
            const std::string& config = "") {
-    std::string defPath = def.empty() ? "" : dir.file("UTIFiles/" + def + ".uti");
-    return Translate(ctx, {defPath, in, out, config});
+    return Translate(ctx, {dir.file("UTIFiles/" + def + ".uti"), in, out, config});
   }
-
-  test::TempDir dir;
   ScriptedUi ui;
   AppContext ctx;
-  std::string input;
-  std::string output;
+  std::string input = dir.write(
+      "job.ctl", CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0", "ZC:300.5"}));
+  std::string output = dir.file("job.pac");
 };
 
-TEST_F(DispatcherTest, ConvertsControlToPointsAndChains) {
-  ASSERT_TRUE(run("CTL2PAC", input, output)) << ui.onlyText();
-  EXPECT_TRUE(ui.boxes.empty());
-  std::string pac = ReadFile(output);
-  EXPECT_NE(pac.find("AC:PD\r\nPN:CP1\r\nYY:1000.0000\r\nXX:2000.0000\r\nZZ:300.5000\r\n"),
-            std::string::npos)
-      << pac;
-  EXPECT_NE(pac.find("PN:CP2\r\nYY:1100.2500\r\nXX:2050.7500\r\nZZ:301.0000\r\n"),
-            std::string::npos);
-}
-
-TEST_F(DispatcherTest, ChecksComeInOrderWithTheirMessages) {
-  EXPECT_FALSE(run("NOPE", input, output));
-  EXPECT_FALSE(run("CTL2PAC", dir.file("missing.ctl"), output));
-  ASSERT_EQ(ui.boxes.size(), 2u);
-  EXPECT_EQ(ui.boxes[0].text, "The specified translation file '" + dir.file("UTIFiles/NOPE.uti") +
-                                  "' does not exist.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-  EXPECT_EQ(ui.boxes[1].text,
-            "The specified input file '" + dir.file("missing.ctl") + "' does not exist.");
-
+TEST_F(DispatcherTest, RefusalsComeInOrderWithTheirMessages) {
+  struct Case {
+    std::string def, in, out, config, text, title;
+  };
+  const std::vector<Case> cases = {
+      {"NOPE", input, output, "",
+       "The specified translation file '" + dir.file("UTIFiles/NOPE.uti") + "' does not exist.",
+       "VORN Zurevazidu"},
+      {"CTL2PAC", dir.file("missing.ctl"), output, "",
+       "The specified input file '" + dir.file("missing.ctl") + "' does not exist.",
+       "VORN Zurevazidu"},
+      {"CTL2PAC", input, output, dir.file("none.trn"),
+       "The specified Translation/Filter file '" + dir.file("none.trn") + "' does not exist.",
+       "VORN Zurevazidu"},
+      // A bare configuration name resolves against the current folder.
+      {"BARE", input, output, "",
+       "The specified Translation/Filter file 'NO-SUCH-CODES.TRN' does not exist.",
+       "VORN Zurevazidu"},
+      {"ODD", input, output, "", "Unknown Translation Routine. Could not perform translation.",
+       "Unknown Routine"},
+      {"CTL2PRJ", input, dir.file("job.prj"), "", "Can not convert to " + kPrj, "Invalid Format"},
+  };
+  for (const Case& c : cases) {
+    ui.boxes.clear();
+    EXPECT_FALSE(run(c.def, c.in, c.out, c.config)) << c.text;
+    ASSERT_EQ(ui.onlyText(), c.text);
+    EXPECT_EQ(ui.boxes[0].title, c.title);
+    EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation) << c.text;
+  }
   ui.boxes.clear();
-  EXPECT_FALSE(run("CTL2PAC", input, output, dir.file("none.trn")));
-  EXPECT_EQ(ui.onlyText(),
-            "The specified Translation/Filter file '" + dir.file("none.trn") + "' does not exist.");
-}
-
-TEST_F(DispatcherTest, AnsweringNoKeepsTheExistingOutput) {
-  dir.write("job.pac", "precious\r\n");
-  ui.answers.push_back(Answer::No);
-  EXPECT_FALSE(run("CTL2PAC", input, output));
-  EXPECT_EQ(ui.onlyText(),
-            "The specified output file '" + output + "' already exists.  Overwrite it?");
-  EXPECT_EQ(ui.boxes[0].buttons, Buttons::YesNo);
-  EXPECT_EQ(ui.boxes[0].icon, Icon::None);
-  EXPECT_EQ(ReadFile(output), "precious\r\n");
-
-  ui.answers.push_back(Answer::Yes);
-  EXPECT_TRUE(run("CTL2PAC", input, output));
-  EXPECT_NE(ReadFile(output).find("PN:CP1"), std::string::npos);
+  EXPECT_FALSE(run("SHORT", input, output));
+  EXPECT_NE(ui.onlyText().find("at least four lines"), std::string::npos);
+  EXPECT_FALSE(std::filesystem::exists(output));
+  EXPECT_TRUE(run("CTL2PAC", input, output)) << ui.onlyText();
+  EXPECT_NE(ReadFile(output).find("PN:CP1\r\nYY:1000.0000\r\nXX:2000.0000\r\nZZ:300.5000\r\n"),
+            std::string::npos);
 }
 
 TEST_F(DispatcherTest, FailingReaderEndsTheRunAndTheOutputSurvives) {
@@ -96,26 +146,6 @@ TEST_F(DispatcherTest, FailingReaderEndsTheRunAndTheOutputSurvives) {
                                   "'.\r\nError on line 4.\r\nAn VORN Control File can not "
                                   "contain blank lines.");
   EXPECT_EQ(ReadFile(output), "precious\r\n");
-}
-
-TEST_F(DispatcherTest, RoutinesAndTypesThatCannotRunSaySo) {
-  EXPECT_FALSE(run("ODD", input, output));
-  EXPECT_EQ(ui.boxes.back().text, "Unknown Translation Routine. Could not perform translation.");
-  EXPECT_EQ(ui.boxes.back().title, "Unknown Routine");
-
-  EXPECT_FALSE(run("CTL2PRJ", input, dir.file("job.prj")));
-  EXPECT_EQ(ui.boxes.back().text, "Can not convert to VORN Project Files (*.PRJ)");
-  EXPECT_EQ(ui.boxes.back().title, "Invalid Format");
-  EXPECT_FALSE(test::TempDir().path().empty());
-
-  EXPECT_FALSE(run("SHORT", input, output));
-  EXPECT_NE(ui.boxes.back().text.find("at least four lines"), std::string::npos);
-}
-
-TEST_F(DispatcherTest, BareConfigurationNameResolvesAgainstTheCurrentFolder) {
-  EXPECT_FALSE(run("BARE", input, output));
-  EXPECT_EQ(ui.onlyText(),
-            "The specified Translation/Filter file 'NO-SUCH-CODES.TRN' does not exist.");
 }
 
 TEST_F(DispatcherTest, ExchangeNamesAreCaseSensitive) {

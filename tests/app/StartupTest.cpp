@@ -1,5 +1,9 @@
+// The start-up: command line, instance lock, and the program driven as another
+// program drives it (command line, standard streams, exit status).
+
 #include <gtest/gtest.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <cstdlib>
@@ -14,37 +18,46 @@
 namespace zv {
 namespace {
 
-TEST(CommandLineTest, ModesByFieldCount) {
-  EXPECT_EQ(ParseCommandLine("").mode, StartMode::Interactive);
-  EXPECT_EQ(ParseCommandLine("-t|ROUTE|in.ctl|out.pac").mode, StartMode::Unattended);
-  EXPECT_EQ(ParseCommandLine("-t|ROUTE|in.ctl|out.pac|C:/x.trn").mode, StartMode::Unattended);
-  EXPECT_EQ(ParseCommandLine("-t||tccin.tmp|tccout.tmp").mode, StartMode::Unattended);
-  EXPECT_EQ(ParseCommandLine("-t|ROUTE|in.ctl").mode, StartMode::WrongCount);
-  EXPECT_EQ(ParseCommandLine("-t|a|b|c|d|e").mode, StartMode::WrongCount);
-  EXPECT_EQ(ParseCommandLine("-s|True|/in/|/out/|JOB7").mode, StartMode::Preset);
-  EXPECT_EQ(ParseCommandLine("-s|True|/in/").mode, StartMode::WrongCount);
-  EXPECT_EQ(ParseCommandLine("-S|True|/in/|/out/|JOB7").mode, StartMode::InvalidArgument);
-  EXPECT_EQ(ParseCommandLine("/t|a|b|c").mode, StartMode::InvalidArgument);
-  // Blanks belong to the fields.
-  auto parsed = ParseCommandLine("-t|My Route|in file.ctl|out.pac");
-  EXPECT_EQ(parsed.fields[1], "My Route");
-  EXPECT_EQ(parsed.fields[2], "in file.ctl");
-}
+namespace fs = std::filesystem;
+using test::ReadFile;
 
-TEST(CommandLineTest, TruthValues) {
-  bool v = false;
-  EXPECT_TRUE(ParseTruthValue("TRUE", v) && v);
-  EXPECT_TRUE(ParseTruthValue("false", v) && !v);
-  EXPECT_TRUE(ParseTruthValue("-1", v) && v);
-  EXPECT_TRUE(ParseTruthValue("0", v) && !v);
-  EXPECT_FALSE(ParseTruthValue("yes", v));
+TEST(CommandLineTest, ModesFieldsAndTruthValues) {
+  using M = StartMode;
+  const std::pair<const char*, M> modes[] = {
+      {"", M::Interactive},
+      {"-t|ROUTE|in.ctl|out.pac", M::Unattended},
+      {"-t|ROUTE|in.ctl|out.pac|C:/x.trn", M::Unattended},
+      {"-t||tccin.tmp|tccout.tmp", M::Unattended},
+      {"-t|ROUTE|in.ctl", M::WrongCount},
+      {"-t|a|b|c|d|e", M::WrongCount},
+      {"-s|True|/in/|/out/|JOB7", M::Preset},
+      {"-s|True|/in/", M::WrongCount},
+      {"-S|True|/in/|/out/|JOB7", M::InvalidArgument},
+      {"/t|a|b|c", M::InvalidArgument},
+  };
+  for (const auto& [line, mode] : modes) EXPECT_EQ(ParseCommandLine(line).mode, mode) << line;
+  // Blanks belong to the fields.
+  EXPECT_EQ(ParseCommandLine("-t|My Route|in file.ctl|out.pac").fields[2], "in file.ctl");
+
+  const std::tuple<const char*, bool, bool> truths[] = {{"TRUE", true, true},
+                                                        {"false", true, false},
+                                                        {"-1", true, true},
+                                                        {"0", true, false},
+                                                        {"yes", false, false}};
+  for (const auto& [text, ok, expected] : truths) {
+    bool v = !expected;
+    EXPECT_EQ(ParseTruthValue(text, v), ok) << text;
+    if (ok) {
+      EXPECT_EQ(v, expected) << text;
+    }
+  }
 }
 
 class RunProgramTest : public ::testing::Test {
  protected:
-  int run(const std::string& args) {
+  int run(const std::string& args, const WindowOpener& window = nullptr) {
     AppContext ctx(ui, dir.path());
-    return RunProgram(ctx, args, nullptr, out);
+    return RunProgram(ctx, args, window, out);
   }
   test::TempDir dir;
   ScriptedUi ui;
@@ -52,16 +65,20 @@ class RunProgramTest : public ::testing::Test {
 };
 
 TEST_F(RunProgramTest, CommandLineErrorsShowTheirMessages) {
-  EXPECT_EQ(run("-t|ROUTE|in.ctl"), 2);
-  EXPECT_EQ(run("-s|True"), 2);
-  EXPECT_EQ(run("-X|a"), 2);
-  EXPECT_EQ(run("-s|maybe|/in/|/out/|JOB"), 2);
-  ASSERT_EQ(ui.boxes.size(), 4u);
-  EXPECT_EQ(ui.boxes[0].text, "Incorrect Number of Command Line Arguments.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
-  EXPECT_EQ(ui.boxes[0].title, "VORN Zurevazidu");
-  EXPECT_EQ(ui.boxes[1].text, "Incorrect Number of Command Line Arguments.");
-  EXPECT_EQ(ui.boxes[2].text, "Invalid Command Line Argument.");
+  const std::pair<const char*, const char*> cases[] = {
+      {"-t|ROUTE|in.ctl", "Incorrect Number of Command Line Arguments."},
+      {"-s|True", "Incorrect Number of Command Line Arguments."},
+      {"-X|a", "Invalid Command Line Argument."},
+      {"-s|maybe|/in/|/out/|JOB",
+       "Invalid Command Line Argument.\r\nThe view field 'maybe' must be True, False or a number."},
+  };
+  for (const auto& [args, text] : cases) {
+    ui.boxes.clear();
+    EXPECT_EQ(run(args), 2) << args;
+    ASSERT_EQ(ui.onlyText(), text) << args;
+    EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+    EXPECT_EQ(ui.boxes[0].title, "VORN Zurevazidu");
+  }
 }
 
 TEST_F(RunProgramTest, SecondInstanceIsRefusedAlsoForUnattendedCalls) {
@@ -74,7 +91,7 @@ TEST_F(RunProgramTest, SecondInstanceIsRefusedAlsoForUnattendedCalls) {
 
 TEST_F(RunProgramTest, InstanceLockIsPrivateAndKeyedByUserAndFolderOnly) {
   test::TempDir runtimeA, runtimeB;
-  std::filesystem::create_directory_symlink(dir.path(), runtimeA.file("link"));
+  fs::create_directory_symlink(dir.path(), runtimeA.file("link"));
   const char* old = std::getenv("XDG_RUNTIME_DIR");
   const std::string saved = old ? old : "";
   ::setenv("XDG_RUNTIME_DIR", runtimeA.path().c_str(), 1);
@@ -100,20 +117,131 @@ TEST_F(RunProgramTest, InstanceLockIsPrivateAndKeyedByUserAndFolderOnly) {
 
 TEST_F(RunProgramTest, PresetsAreHandedToTheWindow) {
   StartupSettings seen;
-  AppContext ctx(ui, dir.path());
-  int status = RunProgram(
-      ctx, "-s|True|/in/|/out/|JOB7",
-      [&](AppContext& c) {
-        seen = c.startup;
-        return 0;
-      },
-      out);
-  EXPECT_EQ(status, 0);
+  EXPECT_EQ(run("-s|True|/in/|/out/|JOB7", [&](AppContext& c) { return seen = c.startup, 0; }), 0);
   EXPECT_TRUE(seen.viewOutput);
   EXPECT_EQ(seen.defaultInputFolder, "/in/");
   EXPECT_EQ(seen.defaultOutputFolder, "/out/");
   EXPECT_EQ(seen.fileStem, "JOB7");
   EXPECT_EQ(seen.configurationFolder, dir.path() + "/TRNFiles");
+}
+
+struct Result {
+  int status;
+  std::string out, err;
+};
+
+// The built program run from a private copy of its application folder.
+class ExecutableTest : public ::testing::Test {
+ protected:
+  ExecutableTest() {
+    const std::string shipped = ZV_APP_DIR;
+    fs::copy(shipped + "/zurevazidu", app.file("zurevazidu"));
+    fs::copy(shipped + "/UTIFiles", app.file("UTIFiles"), fs::copy_options::recursive);
+    fs::copy(shipped + "/samples", work.file("samples"), fs::copy_options::recursive);
+  }
+  // Runs the program in the work folder with the given standard input.
+  Result run(const std::string& args, const std::string& input = "") {
+    std::string in = work.write(".stdin", input);
+    std::string cmd = "cd '" + work.path() + "' && ZUREVAZIDU_UI=console '" +
+                      app.file("zurevazidu") + "' " + args + " <'" + in + "' >'" +
+                      work.file(".stdout") + "' 2>'" + work.file(".stderr") + "'";
+    int raw = std::system(cmd.c_str());
+    return {WIFEXITED(raw) ? WEXITSTATUS(raw) : -1, ReadFile(work.file(".stdout")),
+            ReadFile(work.file(".stderr"))};
+  }
+  Result toPac(const std::string& in, const std::string& out, const std::string& stdIn = "") {
+    return run("'-t|CTL2PAC|" + in + "|" + out + "'", stdIn);
+  }
+  test::TempDir app, work;
+};
+
+TEST_F(ExecutableTest, TranslatesWithRelativePathsAndAsksOnStandardInput) {
+  Result r = toPac("samples/sample.ctl", "job.pac");
+  EXPECT_EQ(r.status, 0) << r.err;
+  EXPECT_EQ(r.err, "");
+  std::string pac = ReadFile(work.file("job.pac"));
+  EXPECT_EQ(pac.rfind("PR:Main Street Reconstruction", 0), 0u) << pac;
+  EXPECT_NE(pac.find("\r\nAC:PD\r\nPN:CP100\r\nYY:"), std::string::npos);
+  EXPECT_EQ(pac.find("\r\nYC:"), std::string::npos);
+
+  work.write("job.pac", "keep me\r\n");
+  Result no = toPac("samples/sample.ctl", "job.pac");
+  EXPECT_EQ(no.status, 1);
+  EXPECT_EQ(no.err,
+            "none: VORN Zurevazidu\nThe specified output file 'job.pac' already exists."
+            "  Overwrite it?\n\n[Yes/No]? ");
+  EXPECT_EQ(ReadFile(work.file("job.pac")), "keep me\r\n");
+  EXPECT_EQ(toPac("samples/sample.ctl", "job.pac", "y\n").status, 0);
+  EXPECT_EQ(ReadFile(work.file("job.pac")), pac);
+}
+
+TEST_F(ExecutableTest, ArgumentsSplitAtBarsAfterJoiningWords) {
+  Result r = run("-t '|CTL2PAC|samples/sample.ctl|job.pac'");
+  EXPECT_EQ(r.status, 2);
+  EXPECT_EQ(r.err, "information: VORN Zurevazidu\nInvalid Command Line Argument.\n\n");
+  Result version = run("--version");
+  EXPECT_EQ(version.status, 0);
+  EXPECT_EQ(version.out.rfind("VORN Zurevazidu ", 0), 0u);
+}
+
+TEST_F(ExecutableTest, BinaryInputIsReportedNotCrashedOn) {
+  std::string junk;
+  for (int i = 0; i < 70000; ++i) junk += static_cast<char>((i * 7919) % 256);
+  work.write("junk.ctl", junk);
+  Result r = toPac("junk.ctl", "junk.pac");
+  EXPECT_EQ(r.status, 1);
+  EXPECT_EQ(r.err.rfind("exclamation: Invalid VORN Control File\n", 0), 0u) << r.err;
+  EXPECT_FALSE(fs::exists(work.file("junk.pac")));
+}
+
+// Every line end reads alike, and a UTF-8 mark is skipped.
+TEST_F(ExecutableTest, LineEndsAndUtf8MarkGiveTheSameOutput) {
+  std::string ctl = ReadFile(work.file("samples/sample.ctl"));
+  ASSERT_EQ(toPac("samples/sample.ctl", "crlf.pac").status, 0);
+  const std::string expected = ReadFile(work.file("crlf.pac"));
+  auto replaced = [&](const std::string& end) {
+    std::string text;
+    for (size_t at = 0, next; at < ctl.size(); at = next + 2) {
+      next = std::min(ctl.find("\r\n", at), ctl.size());
+      text += ctl.substr(at, next - at) + end;
+    }
+    return text;
+  };
+  for (const auto& [name, text] :
+       {std::pair{"cr.ctl", replaced("\r")}, std::pair{"lf.ctl", replaced("\n")},
+        std::pair{"bom.ctl", "\xEF\xBB\xBF" + ctl}}) {
+    work.write(name, text);
+    Result r = toPac(name, std::string(name) + ".pac");
+    EXPECT_EQ(r.status, 0) << name << r.err;
+    EXPECT_EQ(ReadFile(work.file(std::string(name) + ".pac")), expected) << name;
+  }
+}
+
+// UTF-16 input and outputs that are no regular files are refused by name;
+// nothing is written.
+TEST_F(ExecutableTest, Utf16InputAndNonRegularOutputAreRefused) {
+  std::string utf16 = "\xFF\xFE";
+  for (char c : std::string("PN:1\r\nFE:TREE\r\n")) utf16 += std::string{c, '\0'};
+  work.write("wide.ctl", utf16);
+  work.write("wide.trn", utf16);
+  // The definition's configuration is a bare name: it is found in the current folder.
+  work.write("FEATCODES.TRN", ReadFile(std::string(ZV_APP_DIR) + "/TRNFiles/FEATCODES.TRN"));
+  ASSERT_EQ(::mkfifo(work.file("pipe").c_str(), 0600), 0);
+  const std::string refusal = "exclamation: Unsupported Text Encoding\nThe file '";
+  const std::pair<std::string, std::string> cases[] = {
+      {"'-t|CTL2PAC|wide.ctl|out.pac'", refusal + "wide.ctl' is UTF-16"},
+      {"'-t|REPLCTL|wide.ctl|out.pac'", refusal + "wide.ctl' is UTF-16"},
+      {"'-t|REPLCTL|samples/sample.ctl|out.pac|wide.trn'", refusal + "wide.trn' is UTF-16"},
+      {"'-t|CTL2PAC|samples/sample.ctl|pipe'", "pipe"},
+  };
+  for (const auto& [args, message] : cases) {
+    Result r = run(args);
+    EXPECT_EQ(r.status, 1) << args;
+    EXPECT_NE(r.err.find(message), std::string::npos) << args << "\n" << r.err;
+    EXPECT_EQ(r.err.find("not a regular file") != std::string::npos, message == "pipe");
+    EXPECT_FALSE(fs::exists(work.file("out.pac")));
+  }
+  EXPECT_TRUE(fs::is_fifo(work.file("pipe")));
 }
 
 }  // namespace

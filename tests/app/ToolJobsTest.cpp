@@ -1,5 +1,6 @@
 // The external tools of the Pintrel folder, played by small shell scripts
-// that keep a copy of the job file they were given, and the runner beneath.
+// that keep a copy of the job file they were given; the jobs, the routines
+// of the dispatcher and of the Translate window, and the runner beneath.
 
 #include <gtest/gtest.h>
 #include <sys/stat.h>
@@ -9,6 +10,7 @@
 #include "app/AppContext.h"
 #include "app/Dispatcher.h"
 #include "app/ToolJobs.h"
+#include "app/WindowRoutines.h"
 #include "platform/Process.h"
 #include "platform/ScriptedUi.h"
 #include "support/TempDir.h"
@@ -20,46 +22,69 @@ namespace fs = std::filesystem;
 using test::CrLf;
 using test::ReadFile;
 
+const std::string kCtl = "VORN Control Files (*.CTL)";
+
 void MakeExecutable(const std::string& path) {
   ::chmod(path.c_str(), 0755);
 }
 
+// A UI without editor windows.
+struct NoEditorUi : ScriptedUi {
+  bool openEditor(const std::string&, const std::string&, EditorMode) override { return false; }
+};
+
 class ToolJobsTest : public ::testing::Test {
  protected:
-  ToolJobsTest() : ctx(ui, app.path()) { fs::create_directories(pintrel()); }
-
-  std::string pintrel() const { return app.file("Pintrel"); }
+  ToolJobsTest() { fs::create_directories(pintrel); }
 
   // A tool that keeps its job file as <tool>.job and its working folder as
   // <tool>.cwd in the capture folder, then runs the extra shell lines.
   void tool(const std::string& name, const std::string& extra = "") {
-    std::string script = "#!/bin/sh\ncp TRANS.JOB '" + capture.file(name + ".job") + "'\npwd > '" +
-                         capture.file(name + ".cwd") + "'\n" + extra;
-    MakeExecutable(app.write("Pintrel/" + name, script));
+    MakeExecutable(app.write("Pintrel/" + name, "#!/bin/sh\ncp TRANS.JOB '" +
+                                                    capture.file(name + ".job") + "'\npwd > '" +
+                                                    capture.file(name + ".cwd") + "'\n" + extra));
   }
   std::string job(const std::string& name) const { return ReadFile(capture.file(name + ".job")); }
+  bool ran(const std::string& name) const { return fs::exists(capture.file(name + ".job")); }
+  // The program run through the dispatcher, from input to out.txt.
+  bool translate(const std::string& program, const std::string& configuration = "") {
+    const std::string def = work.write("job.uti", CrLf({program, "", "in", "out"}));
+    fs::remove(output);
+    return Translate(ctx, {def, input, output, configuration});
+  }
+  // The program run as the Translate window runs it, viewing its output.
+  bool window(const std::string& program, const std::string& configuration = "",
+              AppContext* context = nullptr) {
+    const WindowRoutine* routine = FindWindowRoutine(program);
+    if (!routine) {
+      ADD_FAILURE() << program << " is not in the table";
+      return false;
+    }
+    WindowRun w{
+        context ? *context : ctx, {input, output, configuration, "", kCtl, ""}, false, {}, {}};
+    w.ctx.startup.viewOutput = true;
+    return routine->run(w);
+  }
 
-  test::TempDir app;
-  test::TempDir work;
-  test::TempDir capture;
+  test::TempDir app, work, capture;
+  const std::string pintrel = app.file("Pintrel");
   ScriptedUi ui;
-  AppContext ctx;
+  AppContext ctx{ui, app.path()};
+  ToolPlace place = PintrelPlace(app.path());
+  std::string input = work.write("in.txt", "x\r\n");
+  std::string output = work.file("out.txt");
+  std::string trn = work.write("CODES.TRN", "a\r\n");
 };
 
 TEST_F(ToolJobsTest, JobFilesHoldTheLinesEachToolReads) {
-  for (const char* name : {"CONVERT.EXE", "EXTRACT.EXE", "PCPT2PI.EXE", "SORT.EXE"}) tool(name);
-  const std::string input = work.write("in.ctl", "x\r\n");
-  const std::string output = work.file("out.ctl");
-  const std::string sorted = work.file("sorted output.ctl");
-  ToolPlace place = PintrelPlace(app.path());
-
+  for (const char* name : {"CONVERT.EXE", "EXTRACT.EXE", "PCPT2PI.EXE", "PI2PCPT.EXE", "SORT.EXE"})
+    tool(name);
   ASSERT_TRUE(ConvertToolJob(ui, input, output, "/cfg/CODES.TRN", place));
   EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, "/cfg/CODES"}));
   // The tool runs in its own folder: a relative configuration reaches it
   // as an absolute path.
   ASSERT_TRUE(ConvertToolJob(ui, input, output, "cfg/CODES.TRN", place));
   EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, (fs::current_path() / "cfg/CODES").string()}));
-
   ASSERT_TRUE(ExtractToolJob(ui, input, output, "/cfg/PICK.TRN", false, place));
   EXPECT_EQ(job("EXTRACT.EXE"), CrLf({input, output, "/cfg/PICK", "N"}));
   ASSERT_TRUE(ExtractToolJob(ui, input, output, "/cfg/PICK.TRN", true, place));
@@ -67,54 +92,42 @@ TEST_F(ToolJobsTest, JobFilesHoldTheLinesEachToolReads) {
 
   // SORT gets its output path as given: no empty file is made for it, and
   // a path that does not exist still reaches the tool.
+  const std::string sorted = work.file("sorted output.ctl");
   ASSERT_TRUE(SortToolJob(ui, input, sorted, place));
   EXPECT_EQ(job("SORT.EXE"), CrLf({input, sorted}));
   EXPECT_FALSE(fs::exists(sorted));
+  // PI2PCPT gets an empty output file so that the tool has its path; a
+  // relative input reaches it as an absolute one, a missing one as "".
+  ASSERT_TRUE(Pi2PcptToolJob(ui, input, work.file("made.ali"), place));
+  EXPECT_EQ(job("PI2PCPT.EXE"), CrLf({input, work.file("made.ali")}));
+  EXPECT_EQ(fs::file_size(work.file("made.ali")), 0u);
+  ASSERT_TRUE(Pi2PcptToolJob(ui, "no-such.ali", work.file("made.ali"), place));
+  EXPECT_EQ(job("PI2PCPT.EXE"), CrLf({"", work.file("made.ali")}));
 
   // The tools run in the job folder and leave no job file behind; the
   // program's own current folder does not move.
-  EXPECT_EQ(ReadFile(capture.file("PCPT2PI.EXE.cwd")), "");
   const fs::path before = fs::current_path();
   ASSERT_TRUE(Pcpt2PiToolJob(ui, input, work.file("new.ali"), place));
-  EXPECT_EQ(ReadFile(capture.file("PCPT2PI.EXE.cwd")), fs::canonical(pintrel()).string() + "\n");
+  EXPECT_EQ(ReadFile(capture.file("PCPT2PI.EXE.cwd")), fs::canonical(pintrel).string() + "\n");
   EXPECT_EQ(fs::current_path(), before);
-  EXPECT_FALSE(fs::exists(app.file("Pintrel/TRANS.JOB")));
+  EXPECT_FALSE(fs::exists(pintrel + "/TRANS.JOB"));
   EXPECT_TRUE(ui.boxes.empty());
-}
-
-TEST_F(ToolJobsTest, EmptyOutputFileIsMadeSoTheToolGetsItsPath) {
-  tool("PI2PCPT.EXE");
-  const std::string input = work.write("in.ali", "x\r\n");
-  const std::string output = work.file("made.ali");
-  ASSERT_TRUE(Pi2PcptToolJob(ui, input, output, PintrelPlace(app.path())));
-  EXPECT_EQ(job("PI2PCPT.EXE"), CrLf({input, output}));
-  ASSERT_TRUE(fs::exists(output));
-  EXPECT_EQ(fs::file_size(output), 0u);
-
-  // A relative input path reaches the tool as an absolute one; a missing
-  // input becomes an empty line.
-  ASSERT_TRUE(Pi2PcptToolJob(ui, "no-such.ali", output, PintrelPlace(app.path())));
-  EXPECT_EQ(job("PI2PCPT.EXE"), CrLf({"", output}));
 }
 
 TEST_F(ToolJobsTest, LlevWritesTheLimitAndMovesItsResultToTheOutput) {
   // The tool writes <input without "lev">prj next to the input.
   tool("LLEV.EXE",
-       "in=$(head -n 1 TRANS.JOB | tr -d '\\r')\n"
-       "printf 'levelled\\r\\n' > \"${in%lev}prj\"\n");
-  const std::string input = work.write("run.lev", "x\r\n");
-  const std::string output = work.file("result.prj");
-  ASSERT_TRUE(LlevToolJob(ui, input, output, 0, PintrelPlace(app.path())));
-  EXPECT_EQ(job("LLEV.EXE"), CrLf({input, "0"}));
-  EXPECT_EQ(ReadFile(output), "levelled\r\n");
+       "in=$(head -n 1 TRANS.JOB | tr -d '\\r')\nprintf 'levelled\\r\\n' > \"${in%lev}prj\"\n");
+  const std::string lev = work.write("run.lev", "x\r\n"), result = work.file("result.prj");
+  ASSERT_TRUE(LlevToolJob(ui, lev, result, 0, place));
+  EXPECT_EQ(job("LLEV.EXE"), CrLf({lev, "0"}));
+  EXPECT_EQ(ReadFile(result), "levelled\r\n");
   EXPECT_FALSE(fs::exists(work.file("run.prj")));
-
-  ASSERT_TRUE(LlevToolJob(ui, input, output, 1250.5, PintrelPlace(app.path())));
-  EXPECT_EQ(job("LLEV.EXE"), CrLf({input, "1250.5"}));
-
+  ASSERT_TRUE(LlevToolJob(ui, lev, result, 1250.5, place));
+  EXPECT_EQ(job("LLEV.EXE"), CrLf({lev, "1250.5"}));
   // An output naming the tool's result itself keeps it (a copy onto itself
   // followed by the delete would lose it).
-  ASSERT_TRUE(LlevToolJob(ui, input, work.file("run.prj"), 0, PintrelPlace(app.path())));
+  ASSERT_TRUE(LlevToolJob(ui, lev, work.file("run.prj"), 0, place));
   EXPECT_EQ(ReadFile(work.file("run.prj")), "levelled\r\n");
   EXPECT_TRUE(ui.boxes.empty());
 }
@@ -124,99 +137,78 @@ TEST_F(ToolJobsTest, LlevWithoutResultIsReportedAndTheInputKept) {
   // An input ending in "prj" is where the result would be: it is no result.
   for (const char* name : {"run.lev", "run.prj"}) {
     ui.boxes.clear();
-    const std::string input = work.write(name, "x\r\n");
-    EXPECT_FALSE(LlevToolJob(ui, input, work.file("out.prj"), 0, PintrelPlace(app.path())));
+    const std::string lev = work.write(name, "x\r\n");
+    EXPECT_FALSE(LlevToolJob(ui, lev, output, 0, place));
     EXPECT_EQ(ui.onlyText(), "LLEV.EXE left no result file '" + work.file("run.prj") + "'.");
-    EXPECT_FALSE(fs::exists(work.file("out.prj")));
-    EXPECT_EQ(ReadFile(input), "x\r\n");
+    EXPECT_FALSE(fs::exists(output));
+    EXPECT_EQ(ReadFile(lev), "x\r\n");
   }
 }
 
 TEST_F(ToolJobsTest, MissingOrUnstartableToolStopsTheRunByName) {
-  const std::string input = work.write("in.ctl", "x\r\n");
-  const std::string output = work.file("out.ctl");
-  EXPECT_FALSE(ConvertToolJob(ui, input, output, "", PintrelPlace(app.path())));
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].text, "The program 'CONVERT.EXE' was not found in '" + pintrel() + "'.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-  EXPECT_FALSE(fs::exists(output));
-  EXPECT_FALSE(fs::exists(app.file("Pintrel/TRANS.JOB")));
+  // Every tool stops the window's run by name, without completion or output.
+  for (const char* program : {"CONVERT.EXE", "PCPT2PI.EXE", "PI2PCPT.EXE", "EXTRACT.EXE",
+                              "CTL2ARE.EXE", "ALI2FLA.EXE", "LLEV.EXE", "SORT.EXE"}) {
+    ui.boxes.clear();
+    EXPECT_FALSE(window(program, trn)) << program;
+    ASSERT_FALSE(ui.boxes.empty()) << program;
+    EXPECT_EQ(ui.boxes.back().text,
+              std::string("The program '") + program + "' was not found in '" + pintrel + "'.");
+    EXPECT_EQ(ui.boxes.back().icon, Icon::Exclamation);
+    EXPECT_TRUE(ui.editors.empty()) << program;
+  }
+  EXPECT_FALSE(translate("PCPT2PI.EXE"));  // the dispatcher alike
+  EXPECT_EQ(ui.boxes.back().text, "The program 'PCPT2PI.EXE' was not found in '" + pintrel + "'.");
 
   // Present but not executable: the start fails, the job file and the
   // empty output made for the tool go anyway.
   app.write("Pintrel/PI2PCPT.EXE", "not a program");
-  EXPECT_FALSE(Pi2PcptToolJob(ui, input, output, PintrelPlace(app.path())));
-  ASSERT_EQ(ui.boxes.size(), 2u);
-  EXPECT_EQ(ui.boxes[1].text,
-            "The program '" + pintrel() + "/PI2PCPT.EXE' could not be started: Permission denied");
-  EXPECT_FALSE(fs::exists(app.file("Pintrel/TRANS.JOB")));
-  EXPECT_FALSE(fs::exists(output));
-
-  // Through the dispatcher the run stops with the same message.
-  const std::string def = work.write("conv.uti", CrLf({"PCPT2PI.EXE", "", "a", "b"}));
-  EXPECT_FALSE(Translate(ctx, {def, input, output, ""}));
+  EXPECT_FALSE(Pi2PcptToolJob(ui, input, output, place));
   EXPECT_EQ(ui.boxes.back().text,
-            "The program 'PCPT2PI.EXE' was not found in '" + pintrel() + "'.");
+            "The program '" + pintrel + "/PI2PCPT.EXE' could not be started: Permission denied");
+  EXPECT_FALSE(fs::exists(pintrel + "/TRANS.JOB"));
+  EXPECT_FALSE(fs::exists(output));
 }
 
 TEST_F(ToolJobsTest, LocalJobsWriteTheirDirectionThenRun) {
   tool("Local.EXE");
-  const std::string input = work.write("in.ctl", "x\r\n");
-  const std::string output = work.file("local.ctl");
-  ToolPlace place = PintrelPlace(app.path());
-  ASSERT_TRUE(LocalGridToLocalJob(ui, input, output, 2, "Scale 1.0002", place));
-  EXPECT_EQ(ReadFile(app.file("Pintrel/TRANS.JOB")),
-            CrLf({input, output.substr(0, output.size() - 4), "2", "Scale 1.0002"}));
+  const std::string local = work.file("local.ctl"), stem = work.file("local");
+  ASSERT_TRUE(LocalGridToLocalJob(ui, input, local, 2, "Scale 1.0002", place));
+  EXPECT_EQ(ReadFile(pintrel + "/TRANS.JOB"), CrLf({input, stem, "2", "Scale 1.0002"}));
   ASSERT_TRUE(LocalRun(ui, place));
-  EXPECT_FALSE(fs::exists(app.file("Pintrel/TRANS.JOB")));
-
-  ASSERT_TRUE(LocalLocalToGridJob(ui, input, output, "a", "b c", "d", place));
+  EXPECT_FALSE(fs::exists(pintrel + "/TRANS.JOB"));
+  ASSERT_TRUE(LocalLocalToGridJob(ui, input, local, "a", "b c", "d", place));
   ASSERT_TRUE(LocalRun(ui, place));
-  EXPECT_EQ(job("Local.EXE"), CrLf({input, output.substr(0, output.size() - 4), "a", "b c", "d"}));
+  EXPECT_EQ(job("Local.EXE"), CrLf({input, stem, "a", "b c", "d"}));
 }
 
-class ToolRoutinesTest : public ToolJobsTest {
- protected:
-  bool translate(const std::string& program, const std::string& configuration = "") {
-    const std::string def = work.write("job.uti", CrLf({program, "", "in", "out"}));
-    std::error_code ec;
-    fs::remove(work.file("out.txt"), ec);
-    return Translate(ctx, {def, input, work.file("out.txt"), configuration});
-  }
-  std::string input = work.write("in.txt", "x\r\n");
-};
-
-TEST_F(ToolRoutinesTest, ConvertShowsTheUnmatchedCodesReport) {
+TEST_F(ToolJobsTest, DispatcherShowsTheToolReports) {
+  // CONVERT's unmatched codes are shown and left in place.
   tool("CONVERT.EXE", "printf 'XX\\r\\n' > Convert.out\n");
-  const std::string trn = work.write("CODES.TRN", "a\r\n");
   ASSERT_TRUE(translate("CONVERT.EXE", trn));
-  EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, work.file("out.txt"), work.file("CODES")}));
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].text, "The following codes had no match.");
+  EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, work.file("CODES")}));
+  EXPECT_EQ(ui.onlyText(), "The following codes had no match.");
   EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
-  ASSERT_EQ(ui.viewed.size(), 1u);
-  EXPECT_EQ(ui.viewed[0], "Out File (*.OUT): " + pintrel() + "/Convert.out");
-  EXPECT_TRUE(fs::exists(pintrel() + "/Convert.out"));  // left in place
-}
-
-TEST_F(ToolRoutinesTest, SortShowsAndDeletesTheFreePointNumbers) {
+  EXPECT_EQ(ui.viewed, std::vector<std::string>{"Out File (*.OUT): " + pintrel + "/Convert.out"});
+  EXPECT_TRUE(fs::exists(pintrel + "/Convert.out"));
+  // SORT's free point numbers are shown and deleted.
   tool("SORT.EXE", "printf '1-99\\r\\n' > PTNUM.INF\n");
+  ui.boxes.clear();
   ASSERT_TRUE(translate("SORT.EXE"));
-  ASSERT_EQ(ui.viewed.size(), 1u);
-  EXPECT_EQ(ui.viewed[0], "Available Point Numbers: " + pintrel() + "/PTNUM.INF");
-  EXPECT_FALSE(fs::exists(pintrel() + "/PTNUM.INF"));
+  EXPECT_EQ(ui.viewed.back(), "Available Point Numbers: " + pintrel + "/PTNUM.INF");
+  EXPECT_FALSE(fs::exists(pintrel + "/PTNUM.INF"));
   EXPECT_TRUE(ui.boxes.empty());
 }
 
-TEST_F(ToolRoutinesTest, ExtractAndLlevAskFirst) {
+TEST_F(ToolJobsTest, DispatcherAsksBeforeExtractAndLlev) {
   tool("EXTRACT.EXE");
   tool("LLEV.EXE", "printf 'r' > \"" + work.file("in.prj") + "\"\n");
-  const std::string trn = work.write("PICK.TRN", "a\r\n");
+  const std::string pick = work.write("PICK.TRN", "a\r\n");
   ui.answers.push_back(Answer::Yes);
-  ASSERT_TRUE(translate("EXTRACT.EXE", trn));
+  ASSERT_TRUE(translate("EXTRACT.EXE", pick));
   EXPECT_EQ(ui.boxes.back().text, "Is extract by any match?");
   EXPECT_EQ(ui.boxes.back().title, "Any Match?");
-  EXPECT_EQ(job("EXTRACT.EXE"), CrLf({input, work.file("out.txt"), work.file("PICK"), "Y"}));
+  EXPECT_EQ(job("EXTRACT.EXE"), CrLf({input, output, work.file("PICK"), "Y"}));
 
   ui.inputs = {std::string("12a")};
   EXPECT_FALSE(translate("LLEV.EXE"));
@@ -224,12 +216,85 @@ TEST_F(ToolRoutinesTest, ExtractAndLlevAskFirst) {
   EXPECT_EQ(ui.inputPrompts.back(),
             "Enter Point Number: Upper limit point number used to exclude points from VORN "
             "Project File:");
-  EXPECT_FALSE(fs::exists(capture.file("LLEV.EXE.job")));
-
+  EXPECT_FALSE(ran("LLEV.EXE"));
   ui.inputs = {std::nullopt};  // Cancel counts as 0
   ASSERT_TRUE(translate("LLEV.EXE"));
   EXPECT_EQ(job("LLEV.EXE"), CrLf({input, "0"}));
-  EXPECT_EQ(ReadFile(work.file("out.txt")), "r");
+  EXPECT_EQ(ReadFile(output), "r");
+}
+
+TEST_F(ToolJobsTest, WindowShowsUnmatchedCodesInsteadOfCompletion) {
+  const std::string report = pintrel + "/Convert.out";
+  tool("CONVERT.EXE", "[ -f make-report ] && printf 'XX\\r\\n' > Convert.out\nexit 0\n");
+  // No report: the usual completion and the output in a viewer.
+  ASSERT_TRUE(window("CONVERT.EXE", trn));
+  EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, work.file("CODES")}));
+  EXPECT_EQ(ui.onlyText(), "Translation Complete.");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_EQ(ui.editors, std::vector<std::string>{"viewer: " + kCtl + ": " + output});
+
+  // A report: its message and the report in a viewer, no completion and no
+  // output; the report is gone afterwards.
+  app.write("Pintrel/make-report", "");
+  ui.boxes.clear();
+  ui.editors.clear();
+  ASSERT_TRUE(window("CONVERT.EXE", trn));
+  EXPECT_EQ(ui.onlyText(), "The following codes had no match.");
+  EXPECT_EQ(ui.editors, std::vector<std::string>{"viewer: Out File (*.OUT): " + report});
+  EXPECT_FALSE(fs::exists(report));
+
+  // A report no window could show is kept.
+  NoEditorUi bare;
+  AppContext bareCtx(bare, app.path());
+  ASSERT_TRUE(window("CONVERT.EXE", trn, &bareCtx));
+  EXPECT_EQ(bare.onlyText(), "The following codes had no match.");
+  EXPECT_EQ(ReadFile(report), "XX\r\n");
+}
+
+TEST_F(ToolJobsTest, WindowSortNeedsItsPointNumberReport) {
+  const std::string report = pintrel + "/PTNUM.INF";
+  tool("SORT.EXE", "[ -f make-report ] && printf '1-99\\r\\n' > PTNUM.INF\nexit 0\n");
+  ASSERT_FALSE(window("SORT.EXE"));
+  EXPECT_EQ(job("SORT.EXE"), CrLf({input, output}));
+  EXPECT_EQ(ui.onlyText(), "The Translation appears to have failed.");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_TRUE(ui.editors.empty());
+
+  // Completion, the output (made by the tool), then the free point numbers.
+  app.write("Pintrel/make-report", "");
+  work.write("out.txt", "sorted\r\n");
+  ui.boxes.clear();
+  ASSERT_TRUE(window("SORT.EXE"));
+  EXPECT_EQ(ui.onlyText(), "Translation Complete.");
+  EXPECT_EQ(ui.editors, (std::vector<std::string>{"viewer: " + kCtl + ": " + output,
+                                                  "viewer: Available Point Numbers: " + report}));
+  EXPECT_FALSE(fs::exists(report));
+}
+
+TEST_F(ToolJobsTest, WindowChecksTheConfigurationThenAsks) {
+  for (const char* program : {"EXTRACT.EXE", "CONVERT.EXE"}) {
+    tool(program);
+    ui.boxes.clear();
+    ASSERT_FALSE(window(program)) << program;
+    EXPECT_EQ(ui.onlyText(), "You must specify a configuration file to use for this translation.");
+    EXPECT_FALSE(ran(program));
+  }
+  ui.boxes.clear();
+  ui.answers.push_back(Answer::Yes);
+  ASSERT_TRUE(window("EXTRACT.EXE", trn));
+  ASSERT_EQ(ui.boxes.size(), 2u);
+  EXPECT_EQ(ui.boxes[0].text, "Is extract by any match?");
+  EXPECT_EQ(ui.boxes[0].buttons, Buttons::YesNo);
+  EXPECT_EQ(ui.boxes[1].text, "Translation Complete.");
+  EXPECT_EQ(job("EXTRACT.EXE"), CrLf({input, output, work.file("CODES"), "Y"}));
+
+  // The limit question comes first and a non-number ends the run there.
+  tool("LLEV.EXE");
+  ui.boxes.clear();
+  ui.inputs = {std::string("12a")};
+  EXPECT_FALSE(window("LLEV.EXE"));
+  EXPECT_EQ(ui.onlyText(), "You must enter a numeric point number.");
+  EXPECT_FALSE(ran("LLEV.EXE"));
 }
 
 // A UI that notes whether the answer file was there at the first message.
@@ -254,38 +319,29 @@ TEST(CoordConvertRoutineTest, RemovesAnOldAnswerBeforeItStarts) {
   EXPECT_FALSE(fs::exists(ui.answer));
 }
 
-TEST(ProcessTest, RunsAndWaitsInTheWorkingFolder) {
+TEST(ProcessTest, RunsAndWaitsInTheWorkingFolderAndRunsBatchFiles) {
   test::TempDir dir;
   ProcessResult r = RunAndWait("/bin/sh", {"-c", "pwd > here; exit 3"}, dir.path(), {});
   ASSERT_TRUE(r.started);
   EXPECT_EQ(r.exitCode, 3);
   EXPECT_EQ(ReadFile(dir.file("here")), fs::canonical(dir.path()).string() + "\n");
-
   ProcessResult missing = RunAndWait(dir.file("nothing"), {}, "", {});
   EXPECT_FALSE(missing.started);
   EXPECT_EQ(missing.error, "No such file or directory");
-}
 
-TEST(ProcessTest, BatchFilesRunWithDelAndProgramsOfTheirFolder) {
-  test::TempDir dir;
+  // Batch files run with "del" and the programs of their folder.
   MakeExecutable(dir.write("prog", "#!/bin/sh\nread a\necho \"got $a\"\n"));
   dir.write("old.out", "stale");
   dir.write("answers.con", "yes\r\n");
-  const std::string bat =
-      dir.write("run.bat", CrLf({"del old.out", "del missing", "prog <answers.con >junk"}));
-  ProcessResult r = RunBatchFile(bat, {});
-  ASSERT_TRUE(r.started);
-  EXPECT_EQ(r.exitCode, 0);
+  ProcessResult bat = RunBatchFile(
+      dir.write("run.bat", CrLf({"del old.out", "del missing", "prog <answers.con >junk"})), {});
+  ASSERT_TRUE(bat.started);
+  EXPECT_EQ(bat.exitCode, 0);
   EXPECT_FALSE(fs::exists(dir.file("old.out")));
   EXPECT_EQ(ReadFile(dir.file("junk")), "got yes\r\n");
-}
 
-TEST(ProcessTest, ShortPathIsTheAbsolutePathOfAnExistingFile) {
-  test::TempDir dir;
-  const std::string file = dir.write("a b.txt", "");
-  EXPECT_EQ(ShortPath(file), file);
+  EXPECT_EQ(ShortPath(dir.file("prog")), dir.file("prog"));
   EXPECT_EQ(ShortPath(dir.file("none.txt")), "");
-  EXPECT_EQ(ShortPath(""), "");
 }
 
 }  // namespace

@@ -46,16 +46,14 @@ class TranslateLogicTest : public ::testing::Test {
   void def(const std::string& name, const std::vector<std::string>& lines) {
     dir.write("UTIFiles/" + name + ".uti", CrLf(lines));
   }
-  // Selects the three entries by name.
-  void choose(const std::string& in, const std::string& out, const std::string& action) {
+  // Selects the three entries by name and fills the location boxes.
+  void choose(const std::string& in, const std::string& out, const std::string& action,
+              const std::string& from = "", const std::string& to = "") {
     logic.selectInputType(logic.inputTypes.find(in));
     logic.selectOutputType(logic.outputTypes.find(out));
     logic.selectAction(logic.actions.find(action));
-  }
-  std::vector<std::string> texts() const {
-    std::vector<std::string> t;
-    for (const auto& b : ui.boxes) t.push_back(b.text);
-    return t;
+    if (!from.empty()) logic.input.text = from;
+    if (!to.empty()) logic.output.text = dir.file(to);
   }
 
   test::TempDir dir;
@@ -65,19 +63,14 @@ class TranslateLogicTest : public ::testing::Test {
   std::string input;
 };
 
-TEST(ChoiceListTest, FillDropsEmptyAndRepeatedEntriesKeepingFirstPositions) {
+TEST(ChoiceListTest, FillDropsEmptyAndRepeatedEntriesAndConsoleGoesBelow) {
   ChoiceList list;
   list.fill("B||A|B|C||A|");
   EXPECT_EQ(list.items, (std::vector<std::string>{"B", "A", "C"}));
   EXPECT_EQ(list.selected, -1);
-  list.fill("");
-  EXPECT_TRUE(list.items.empty());
-}
-
-TEST(ConsoleBelowTest, CentresTheToolConsoleBelowTheWindow) {
-  const ConsolePlace place = ConsoleBelow({100, 50, 601, 400});
-  EXPECT_EQ(place.left, 81);  // 100 + 300.5 rounded, less half of 640
-  EXPECT_EQ(place.top, 450);
+  // The tool console is centred below the window: 100 + 300.5 rounded, less half of 640.
+  EXPECT_EQ(ConsoleBelow({100, 50, 601, 400}).left, 81);
+  EXPECT_EQ(ConsoleBelow({100, 50, 601, 400}).top, 450);
 }
 
 TEST_F(TranslateLogicTest, ListsCascadeFromTheCatalogue) {
@@ -113,16 +106,12 @@ TEST_F(TranslateLogicTest, ListsCascadeFromTheCatalogue) {
   EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"To CTL", "Batch"}));
   EXPECT_FALSE(logic.configuration.enabled);
   EXPECT_FALSE(logic.storeDefault);
-}
 
-TEST_F(TranslateLogicTest, ManualEntryHasNoLocationAndSkipsTheFileChecks) {
-  ASSERT_TRUE(logic.load());
+  // Manual entry has no locations and skips the file checks; its routine is
+  // not one the window runs.
   logic.selectInputType(logic.inputTypes.find(kManualEntryType));
-  EXPECT_FALSE(logic.input.enabled);
-  EXPECT_EQ(logic.input.text, "");
-  EXPECT_FALSE(logic.output.enabled);
-  EXPECT_EQ(logic.output.text, "");
-  // No input path is asked for; the routine is not one the window runs yet.
+  EXPECT_FALSE(logic.input.enabled || logic.output.enabled);
+  EXPECT_EQ(logic.input.text + logic.output.text, "");
   EXPECT_FALSE(logic.translate());
   EXPECT_EQ(ui.onlyText(), "Could not perform translation.");
 }
@@ -145,52 +134,32 @@ TEST_F(TranslateLogicTest, PresetsProposeFolderStemAndExtension) {
 TEST_F(TranslateLogicTest, ChecksComeInOrderEachWithItsMessage) {
   ASSERT_TRUE(logic.load());
   choose(kCtl, kCtl, "Filter");
+  // Everything wrong at first; each step mends one thing.
+  logic.inputTypes.selected = logic.outputTypes.selected = logic.actions.selected = -1;
+  logic.input.text = logic.output.text = "";
+  logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
   const std::string output = dir.file("out/job.CTL");
-  struct Step {
-    std::function<void()> change;
-    std::string message;
-  };
-  std::vector<Step> steps = {
-      {[&] { logic.inputTypes.selected = -1; }, "You must select an input type"},
-      {[&] {
-         logic.inputTypes.selected = 0;
-         logic.input.text = "";
-       },
-       "You must enter an input file location and name."},
+  const std::pair<std::function<void()>, std::string> steps[] = {
+      {[] {}, "You must select an input type"},
+      {[&] { logic.inputTypes.selected = 0; }, "You must enter an input file location and name."},
       {[&] { logic.input.text = dir.file("data/"); }, "The specified input file does not exist."},
-      {[&] {
-         logic.input.text = input;
-         logic.outputTypes.selected = -1;
-       },
-       "You must select an output type"},
-      {[&] {
-         logic.outputTypes.selected = logic.outputTypes.find(kCtl);
-         logic.output.text = "";
-       },
+      {[&] { logic.input.text = input; }, "You must select an output type"},
+      {[&] { logic.outputTypes.selected = logic.outputTypes.find(kCtl); },
        "You must enter an output file location and name."},
       {[&] { logic.output.text = dir.file("DATA/JOB.ctl"); },
        "The input and output files can not be the same."},
-      {[&] {
-         logic.output.text = output;
-         logic.actions.selected = -1;
-       },
-       "You must select an action type"},
-      {[&] {
-         logic.actions.selected = logic.actions.find("Filter");
-         logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
-       },
+      {[&] { logic.output.text = output; }, "You must select an action type"},
+      {[&] { logic.actions.selected = logic.actions.find("Filter"); },
        "The specified translation/filter file does not exist."},
   };
-  for (const Step& step : steps) {
+  for (const auto& [mend, message] : steps) {
     ui.boxes.clear();
-    step.change();
+    mend();
     EXPECT_FALSE(logic.translate());
-    ASSERT_EQ(ui.boxes.size(), 1u) << step.message;
-    EXPECT_EQ(ui.boxes[0].text, step.message);
+    ASSERT_EQ(ui.onlyText(), message);
     EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-    EXPECT_EQ(ui.boxes[0].title, step.message.starts_with("The input and output")
-                                     ? "Incompatible Files"
-                                     : "VORN Zurevazidu");
+    EXPECT_EQ(ui.boxes[0].title, message.starts_with("The input and output") ? "Incompatible Files"
+                                                                             : "VORN Zurevazidu");
   }
   EXPECT_FALSE(std::filesystem::exists(output));
 }
@@ -198,9 +167,7 @@ TEST_F(TranslateLogicTest, ChecksComeInOrderEachWithItsMessage) {
 // Two spellings of one file must not let the output replace the input.
 TEST_F(TranslateLogicTest, RefusesTwoNamesOfTheSameFile) {
   ASSERT_TRUE(logic.load());
-  choose(kCtl, kCtl, "Copy");
-  logic.input.text = input;
-  logic.output.text = dir.file("data/../data/./job.ctl");
+  choose(kCtl, kCtl, "Copy", input, "data/../data/./job.ctl");
   EXPECT_FALSE(logic.translate());
   EXPECT_EQ(ui.onlyText(), "The input and output files can not be the same.");
   std::filesystem::create_symlink(input, dir.file("out/link.ctl"));
@@ -211,9 +178,7 @@ TEST_F(TranslateLogicTest, RefusesTwoNamesOfTheSameFile) {
 
 TEST_F(TranslateLogicTest, ConvertFileRunsAndReportsCompletion) {
   ASSERT_TRUE(logic.load());
-  choose(kCtl, kPac, "To PAC");
-  logic.input.text = input;
-  logic.output.text = dir.file("out/job.pac");
+  choose(kCtl, kPac, "To PAC", input, "out/job.pac");
   ctx.work.ConversionOptionsActive = true;
   int longRuns = 0;
   logic.setLongRunner([&](const std::function<bool()>& work) {
@@ -223,8 +188,7 @@ TEST_F(TranslateLogicTest, ConvertFileRunsAndReportsCompletion) {
   ASSERT_TRUE(logic.translate()) << ui.onlyText();
   EXPECT_EQ(longRuns, 1);
   EXPECT_FALSE(ctx.work.ConversionOptionsActive);
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].text, "Conversion Complete.");
+  ASSERT_EQ(ui.onlyText(), "Conversion Complete.");
   EXPECT_EQ(ui.boxes[0].title, "Conversion Complete");
   EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
   EXPECT_NE(ReadFile(dir.file("out/job.pac")).find("PN:CP2\r\n"), std::string::npos);
@@ -241,18 +205,14 @@ TEST_F(TranslateLogicTest, ConvertFileRunsAndReportsCompletion) {
 
 TEST_F(TranslateLogicTest, RunFailuresNameTheirCause) {
   ASSERT_TRUE(logic.load());
-  choose(kCtl, kPrj, "To PRJ");
-  logic.input.text = input;
-  logic.output.text = dir.file("out/job.prj");
+  choose(kCtl, kPrj, "To PRJ", input, "out/job.prj");
   EXPECT_FALSE(logic.translate());
   EXPECT_EQ(ui.onlyText(), "Can not convert to " + kPrj);
   EXPECT_EQ(ui.boxes[0].title, "Invalid Format");
   EXPECT_FALSE(std::filesystem::exists(dir.file("out/job.prj")));
 
   ui.boxes.clear();
-  choose(kPac, kCtl, "Batch");
-  logic.input.text = input;
-  logic.output.text = dir.file("out/job.CTL");
+  choose(kPac, kCtl, "Batch", input, "out/job.CTL");
   EXPECT_FALSE(logic.translate());
   EXPECT_EQ(ui.onlyText(), "Could not perform translation.");
 }
@@ -265,8 +225,7 @@ TEST_F(TranslateLogicTest, ErrorsRaisedDuringARunAreShownWithTheirSource) {
     throw ZvError(13, "Type mismatch", "modAngles.Angles_PackedToRadians");
   });
   EXPECT_FALSE(logic.translate());
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].text, "Type mismatch");
+  ASSERT_EQ(ui.onlyText(), "Type mismatch");
   EXPECT_EQ(ui.boxes[0].title, "modAngles.Angles_PackedToRadians");
 }
 
@@ -274,10 +233,8 @@ TEST_F(TranslateLogicTest, ReplaceChecksItsConfigurationAndStoresTheDefault) {
   ASSERT_TRUE(logic.load());
   // A "Replace" definition without a default configuration file.
   const std::string pac = dir.write("data/job.pac", CrLf({"AC:PD", "PN:CP1"}));
-  choose(kPac, kPac, "Bare filter");
+  choose(kPac, kPac, "Bare filter", pac, "out/job.pac");
   EXPECT_FALSE(logic.configuration.enabled);
-  logic.input.text = pac;
-  logic.output.text = dir.file("out/job.pac");
   EXPECT_FALSE(logic.translate());
   EXPECT_EQ(ui.onlyText(), "You must specify a configuration file to use for this translation.");
   logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
@@ -286,10 +243,7 @@ TEST_F(TranslateLogicTest, ReplaceChecksItsConfigurationAndStoresTheDefault) {
   EXPECT_EQ(ui.onlyText(), "The specified configuration file does not exist.");
 
   ui.boxes.clear();
-  choose(kCtl, kCtl, "Filter");
-  logic.input.text = input;
-  logic.output.text = dir.file("out/job.CTL");
-
+  choose(kCtl, kCtl, "Filter", input, "out/job.CTL");
   // A browsed file clears the "default" box: the definition keeps its default.
   const std::string other = dir.write("elsewhere/OTHER.TRN", CrLf({"FE:POLE FE:MAST"}));
   ui.files.push_back(other);
@@ -311,29 +265,23 @@ TEST_F(TranslateLogicTest, ReplaceChecksItsConfigurationAndStoresTheDefault) {
 
 TEST_F(TranslateLogicTest, CancelRecordsTheDefinitionTheNextStartOpensOn) {
   ASSERT_TRUE(logic.load());
-  choose(kCtl, kCtl, "Copy");
-  logic.input.text = input;
-  logic.output.text = dir.file("out/copy.ctl");
+  choose(kCtl, kCtl, "Copy", input, "out/copy.ctl");
   ASSERT_TRUE(logic.translate());
   logic.cancel();
   EXPECT_EQ(ReadFile(dir.file("Quorvane.cfg")), CrLf({dir.file("UTIFiles/A4.uti")}));
 
-  AppContext next(ui, dir.path());
-  TranslateLogic again(next);
-  ASSERT_TRUE(again.load());
-  EXPECT_EQ(again.inputTypes.current(), kCtl);
-  EXPECT_EQ(again.outputTypes.current(), kCtl);
-  EXPECT_EQ(again.actions.current(), "Copy");
-
-  // A definition that is gone: the window opens on the first entries.
-  std::filesystem::remove(dir.file("UTIFiles/A4.uti"));
-  AppContext third(ui, dir.path());
-  TranslateLogic gone(third);
-  ASSERT_TRUE(gone.load());
-  EXPECT_EQ(gone.outputTypes.current(), kPac);
+  // The next start opens on it; on the first entries once it is gone.
+  for (const std::string& opened : {kCtl, kPac}) {
+    AppContext next(ui, dir.path());
+    TranslateLogic again(next);
+    ASSERT_TRUE(again.load());
+    EXPECT_EQ(again.inputTypes.current() + again.outputTypes.current() + again.actions.current(),
+              kCtl + opened + (opened == kCtl ? "Copy" : "To PAC"));
+    std::filesystem::remove(dir.file("UTIFiles/A4.uti"));
+  }
 }
 
-TEST_F(TranslateLogicTest, BrowseButtonsAskWithTheTypeFilters) {
+TEST_F(TranslateLogicTest, BrowseAndEditButtons) {
   def("D1", {"ConvertFile", "Flex", "User-Defined ASCII Files (*.*)", kCtl});
   ASSERT_TRUE(logic.load());
   ui.files = {dir.file("data/picked.ctl"), std::nullopt};
@@ -351,10 +299,8 @@ TEST_F(TranslateLogicTest, BrowseButtonsAskWithTheTypeFilters) {
   EXPECT_EQ(ui.fileDialogs[1].kind, FileDialogKind::Save);
   EXPECT_EQ(ui.fileDialogs[1].filter, kPac + "|*.PAC");
   EXPECT_EQ(ui.fileDialogs[2].filter, "User-Defined ASCII Files (*.*)|*.*");
-}
 
-TEST_F(TranslateLogicTest, ConfigurationFilesOpenInTheEditor) {
-  ASSERT_TRUE(logic.load());
+  // Configuration files open in the editor.
   logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
   logic.editConfiguration();
   EXPECT_EQ(ui.onlyText(), "The file '" + dir.file("TRNFiles/NONE.TRN") + "' does not exist.");
@@ -372,12 +318,11 @@ TEST_F(TranslateLogicTest, ConsoleCannotBrowseOrEditButCanView) {
   std::ostringstream out, err;
   ConsoleUi console(in, out, err);
   AppContext consoleCtx(console, dir.path());
-  consoleCtx.startup = ctx.startup;
   TranslateLogic consoleLogic(consoleCtx);
   ASSERT_TRUE(consoleLogic.load());
-  const std::string before = consoleLogic.input.text;
+  consoleLogic.input.text = "typed";
   consoleLogic.browseInput();
-  EXPECT_EQ(consoleLogic.input.text, before);
+  EXPECT_EQ(consoleLogic.input.text, "typed");
   consoleLogic.newConfiguration();
   EXPECT_EQ(err.str(),
             "exclamation: VORN Zurevazidu\n"
@@ -390,8 +335,7 @@ TEST_F(TranslateLogicTest, ConsoleCannotBrowseOrEditButCanView) {
 TEST_F(TranslateLogicTest, NoDefinitionsLeaveTheListsEmpty) {
   std::filesystem::remove_all(dir.file("UTIFiles"));
   EXPECT_FALSE(logic.load());
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].text, "No valid translations were found!");
+  ASSERT_EQ(ui.onlyText(), "No valid translations were found!");
   EXPECT_EQ(ui.boxes[0].icon, Icon::Critical);
   EXPECT_TRUE(logic.inputTypes.items.empty());
   EXPECT_FALSE(logic.translate());

@@ -1,16 +1,20 @@
-// The batch exchange through tccin.tmp and tccout.tmp of the application
-// folder: request reading, zone lookup, the automatic conversions, the
-// answer file, and refusals that leave no answer behind.
+// The batch coordinate exchange through tccin.tmp and tccout.tmp of the
+// application folder: the program run with -t||tccin.tmp|tccout.tmp from a
+// private application folder and its answers checked against PROJ; the
+// refusals, the zone lookup and the manual mode in process.
 
 #include <gtest/gtest.h>
+#include <proj.h>
+#include <sys/wait.h>
 
+#include <cmath>
+#include <cstdlib>
 #include <filesystem>
 #include <sstream>
 
 #include "geodesy/Angles.h"
 #include "geodesy/BatchExchange.h"
 #include "geodesy/NgsTestSupport.h"
-#include "platform/Numbers.h"
 #include "platform/ScriptedUi.h"
 #include "platform/TextIo.h"
 #include "support/TempDir.h"
@@ -20,248 +24,321 @@ namespace {
 
 namespace fs = std::filesystem;
 using test::CrLf;
-using test::ReadFile;
+using V = std::vector<std::string>;
 
-std::tm FixedTime() {
-  std::tm t{};
-  t.tm_year = 2026 - 1900;
-  t.tm_mon = 11;
-  t.tm_mday = 6;
-  t.tm_hour = 14;
-  t.tm_min = 3;
-  t.tm_sec = 9;
-  return t;
-}
+constexpr double kDeg = 3.14159265358979323846 / 180.0;
 
-std::vector<std::string> Header(const std::string& mode, const std::string& kind,
-                                const std::string& system, const std::string& zone,
-                                const std::string& hUnits = "M", const std::string& geoid = "") {
-  return {"Caller 2.0", "request", mode,   kind, system,        zone,
-          "83",         "88",      hUnits, "M",  "Orthometric", geoid};
-}
+// PROJ's projected CRS of a zone (the EPSG code of its "Full Name").
+class Reference {
+ public:
+  explicit Reference(const std::string& fullName) {
+    const std::string code = fullName.substr(fullName.find("EPSG:"));
+    crs_ = proj_create(ctx_, code.substr(0, code.find(')')).c_str());
+    PJ* cs = proj_crs_get_coordinate_system(ctx_, crs_);
+    proj_cs_get_axis_info(ctx_, cs, 0, nullptr, nullptr, nullptr, &toMeters, nullptr, nullptr,
+                          nullptr);
+    proj_destroy(cs);
+    PJ* base = proj_crs_get_geodetic_crs(ctx_, crs_);
+    PJ* op = proj_create_crs_to_crs_from_pj(ctx_, base, crs_, nullptr, nullptr);
+    op_ = proj_normalize_for_visualization(ctx_, op);
+    proj_destroy(op);
+    proj_destroy(base);
+    proj_get_area_of_use(ctx_, crs_, &west, &south, &east, &north, nullptr);
+    // Convergence and scale factor from the projection in metres
+    // (proj_factors does not take the foot units of a CRS).
+    std::string def = proj_as_proj_string(ctx_, crs_, PJ_PROJ_5, nullptr);
+    for (const char* key : {" +units=", " +vunits="}) {
+      const size_t at = def.find(key);
+      if (at != std::string::npos) def.erase(at, def.find(' ', at + 1) - at);
+    }
+    projection_ = proj_create(ctx_, (def + " +units=m").c_str());
+  }
+  ~Reference() {
+    for (PJ* p : {projection_, op_, crs_}) proj_destroy(p);
+    proj_context_destroy(ctx_);
+  }
+  // Easting and northing in the zone's units from east-positive degrees.
+  PJ_XY forward(double latDeg, double lonDeg) const {
+    return proj_trans(op_, PJ_FWD, proj_coord(lonDeg, latDeg, 0, 0)).xy;
+  }
+  PJ_LP inverse(double easting, double northing) const {
+    return proj_trans(op_, PJ_INV, proj_coord(easting, northing, 0, 0)).lp;
+  }
+  PJ_FACTORS factors(double latDeg, double lonDeg) const {
+    return proj_factors(projection_, proj_coord(lonDeg * kDeg, latDeg * kDeg, 0, 0));
+  }
+  double toMeters = 1.0, west = 0, south = 0, east = 0, north = 0;
 
-class BatchExchangeTest : public ::testing::Test {
- protected:
-  BatchExchangeTest() {
-    test::InstallCatalogs(app.path());
-    state.now = FixedTime;
-  }
-  bool exchange(std::vector<std::string> lines, const ManualConversion& manual = nullptr) {
-    app.write("tccin.tmp", CrLf(lines));
-    return BatchExchange(ui, app.path(), state, manual);
-  }
-  std::vector<std::string> answer() {
-    std::vector<std::string> lines;
-    ReadTextLines(app.file("tccout.tmp"), lines);
-    return lines;
-  }
-  test::TempDir app;
-  ScriptedUi ui;
-  ConversionState state;
+ private:
+  PJ_CONTEXT* ctx_ = proj_context_create();
+  PJ *crs_ = nullptr, *op_ = nullptr, *projection_ = nullptr;
 };
 
-std::vector<std::string> Fields(const std::string& line) {
-  std::vector<std::string> f;
+V Fields(const std::string& line) {
+  V f;
   std::stringstream row(line);
   for (std::string field; std::getline(row, field, ',');) f.push_back(field);
   if (!line.empty() && line.back() == ',') f.push_back("");
   return f;
 }
 
-TEST_F(BatchExchangeTest, GridPointsAreAnsweredWithGeographicCoordinates) {
-  // A station of the NGS SPCS83 example (32 16 52.33969 N, 106 45 15.77636 W)
-  // in UTM zone 13.
-  std::vector<SurveyPoint> station(1);
-  station[0].Latitude = (32 + 16 / 60.0 + 52.33969 / 3600) * kDegreesToRadians;
-  station[0].Longitude = (106 + 45 / 60.0 + 15.77636 / 3600) * kDegreesToRadians;
-  ASSERT_TRUE(
-      GeographicToGrid(ui, app.path(), station, "UTM NAD 83", "Zone 13N", "NAD 83", kMeters));
-  char bm2[128];
-  std::snprintf(bm2, sizeof bm2, "BM2,%.4f,%.4f,1520.25,0.01,0.02,0.03", station[0].Northing,
-                station[0].Easting);
-
-  auto lines = Header("Automatic", "Plane", "UTM NAD 83", "Zone 13N");
-  lines.push_back("P1,12.3,45.6,,,,");
-  lines.push_back(bm2);
-  ASSERT_TRUE(exchange(lines)) << ui.onlyText();
-  auto out = answer();
-  ASSERT_EQ(out.size(), 14u);
-  EXPECT_EQ(out[0], "VORN Zurevazidu 1.0.0");
-  EXPECT_EQ(out[1], "12/06/2026 14:03:09");
-  EXPECT_EQ(std::vector<std::string>(out.begin() + 2, out.begin() + 12),
-            (std::vector<std::string>{"Automatic", "Plane", "Geographic Coordinates", "", "NAD 83",
-                                      "NAVD 88", "M", "Meters", "", ""}));
-  // Far off the zone, but answered: two lengths, four empty fields, then
-  // convergence, scale factor, no geoid height, latitude and longitude.
-  EXPECT_EQ(out[12].rfind("P1,12.3000,45.6000,,,,,", 0), 0u) << out[12];
-  std::vector<std::string> f = Fields(out[13]);
-  ASSERT_EQ(f.size(), 13u) << out[13];
-  EXPECT_EQ(std::vector<std::string>(f.begin() + 3, f.begin() + 7),
-            (std::vector<std::string>{"1520.2500", "0.0100", "0.0200", "0.0300"}));
-  EXPECT_EQ(f[7], Angles_RadiansToPacked(ui, station[0].Convergence, 1));
-  EXPECT_EQ(f[8], FormatFixed(station[0].ScaleFactor, 8));
-  EXPECT_EQ(f[9], "");
-  EXPECT_EQ(f[10], "32.165233969");
-  EXPECT_EQ(f[11], "106.451577636");
-  EXPECT_EQ(f[12], "");
-  EXPECT_TRUE(ui.boxes.empty());
+// A packed "DDD.MMSSsssss" text in degrees.
+double PackedDegrees(const std::string& text) {
+  ScriptedUi ui;
+  return Angles_PackedToRadians(ui, text) / kDegreesToRadians;
 }
 
-TEST_F(BatchExchangeTest, LengthsAreAnsweredInTheUnitsAsked) {
-  // A metre zone asked in U.S. survey feet: the northing stays in feet in
-  // the answer, as line 9 says, although the projection computed in metres.
-  auto lines = Header("Automatic", "Plane", "UTM NAD 83", "Zone 13N", "F");
-  lines.push_back("A,11724000.0000,1873400.0000,100,,,");
-  ASSERT_TRUE(exchange(lines)) << ui.onlyText();
-  auto out = answer();
-  ASSERT_EQ(out.size(), 13u);
-  EXPECT_EQ(out[8], "F");
-  EXPECT_EQ(out[12].rfind("A,11724000.0000,1873400.0000,100.0000,,,,", 0), 0u) << out[12];
+class BatchExchangeTest : public ::testing::Test {
+ protected:
+  BatchExchangeTest() {
+    fs::copy(std::string(ZV_APP_DIR) + "/zurevazidu", app.file("zurevazidu"));
+    test::InstallCatalogs(app.path());
+    test::InstallAllStandIns(app.path());
+  }
+  struct Result {
+    int status;
+    std::string err;
+    V answer;
+  };
+  // Writes tccin.tmp and runs the exchange from another current folder.
+  Result run(const V& request) {
+    app.write("tccin.tmp", CrLf(request));
+    const std::string cmd = "cd '" + work.path() + "' && ZUREVAZIDU_UI=console '" +
+                            app.file("zurevazidu") + "' '-t||tccin.tmp|tccout.tmp' </dev/null 2>'" +
+                            work.file("err") + "'";
+    const int raw = std::system(cmd.c_str());
+    Result r{WIFEXITED(raw) ? WEXITSTATUS(raw) : -1, test::ReadFile(work.file("err")), {}};
+    ReadTextLines(app.file("tccout.tmp"), r.answer);
+    return r;
+  }
+  // The same in process.
+  bool exchange(const V& request, const ManualConversion& manual = nullptr) {
+    app.write("tccout.tmp", "previous answer\r\n");
+    app.write("tccin.tmp", CrLf(request));
+    return BatchExchange(ui, app.path(), state, manual);
+  }
+  static V Header(const std::string& kind, const std::string& system, const std::string& zone,
+                  const std::string& units = "M", const std::string& geoid = "") {
+    return {"Caller 2.0", "request", "Automatic", kind, system,        zone,
+            "83",         "88",      units,       "M",  "Orthometric", geoid};
+  }
+  test::TempDir app, work;
+  ScriptedUi ui;
+  ConversionState state;
+};
+
+// One zone of each form, in each unit (the oblique Mercator zone's EPSG
+// azimuth is rounded, which moves PROJ by up to 0.9 mm).
+TEST_F(BatchExchangeTest, AnswersAgreeWithPROJ) {
+  const struct {
+    std::string system, zone, units, fullName;
+    double tolerance;  // metres
+  } zones[] = {
+      {"State Plane 1983", "New Mexico Central 3002", "F", "(EPSG:2258)", 0.001},
+      {"State Plane 1983", "North Dakota North 3301", "I", "(EPSG:2265)", 0.001},
+      {"State Plane 1983", "Alaska Zone 1 5001", "M", "(EPSG:26931)", 0.002},
+  };
+  // Convergence is answered with one decimal of seconds, formatted from the
+  // angle rounded to five decimals of degrees (0.018"): 0.05" + 0.018".
+  const double convergence = 0.069;
+  for (const auto& z : zones) {
+    SCOPED_TRACE(z.zone);
+    const Reference ref(z.fullName);
+    V plane = Header("Plane", z.system, z.zone, z.units);
+    V geographic = Header("Geographic", z.system, z.zone, z.units);
+    std::vector<std::pair<double, double>> samples;  // inner part of the area of use
+    for (double i : {0.15, 0.5, 0.85}) {
+      for (double j : {0.15, 0.5, 0.85}) {
+        const double lat = ref.south + (ref.north - ref.south) * i;
+        const double lon = ref.west + (ref.east - ref.west) * j;
+        const PJ_XY g = ref.forward(lat, lon);
+        char line[128];
+        std::snprintf(line, sizeof line, "P,%.4f,%.4f,100,,,", g.y, g.x);
+        plane.push_back(line);
+        const std::string packedLat = Angles_RadiansToPacked(ui, lat * kDeg, 5);
+        const std::string packedLon = Angles_RadiansToPacked(ui, -lon * kDeg, 5);
+        geographic.push_back("G," + packedLat + "," + packedLon + ",");
+        samples.emplace_back(PackedDegrees(packedLat), -PackedDegrees(packedLon));
+      }
+    }
+    const Result p = run(plane);
+    ASSERT_EQ(p.status, 0) << p.err;
+    ASSERT_EQ(p.answer.size(), plane.size());
+    EXPECT_EQ(p.answer[0], "VORN Zurevazidu 1.0.0");
+    EXPECT_EQ(V(p.answer.begin() + 2, p.answer.begin() + 12),
+              (V{"Automatic", "Plane", "Geographic Coordinates", "", "NAD 83", "NAVD 88", z.units,
+                 "Meters", "", ""}));
+    const Result g = run(geographic);
+    ASSERT_EQ(g.status, 0) << g.err;
+    ASSERT_EQ(g.answer.size(), geographic.size());
+    EXPECT_EQ(V(g.answer.begin() + 2, g.answer.begin() + 12),
+              (V{"Automatic", "Plane", z.system, z.zone, "NAD 83", "NAVD 88", z.units, "Meters", "",
+                 ""}));
+    for (size_t i = 0; i < samples.size(); ++i) {
+      // Grid points: PROJ's position for the grid coordinates as written.
+      V f = Fields(p.answer[12 + i]);
+      ASSERT_EQ(f.size(), 13u) << p.answer[12 + i];
+      EXPECT_EQ(V(f.begin() + 3, f.begin() + 7), (V{"100.0000", "", "", ""}));
+      const PJ_LP lp = ref.inverse(std::stod(f[2]), std::stod(f[1]));
+      const double dn = (PackedDegrees(f[10]) - lp.phi) * 111320.0;
+      const double de = (-PackedDegrees(f[11]) - lp.lam) * 111320.0 * std::cos(lp.phi * kDeg);
+      EXPECT_LT(std::hypot(dn, de), z.tolerance) << p.answer[12 + i];
+      PJ_FACTORS fac = ref.factors(lp.phi, lp.lam);
+      EXPECT_NEAR(PackedDegrees(f[7]) * 3600, fac.meridian_convergence / kDeg * 3600, convergence);
+      EXPECT_NEAR(std::stod(f[8]), fac.meridional_scale, 2e-8);
+      EXPECT_EQ(f[9] + f[12], "");
+      // Geographic points: PROJ's grid coordinates.
+      f = Fields(g.answer[12 + i]);
+      ASSERT_EQ(f.size(), 13u) << g.answer[12 + i];
+      const auto [lat, lon] = samples[i];
+      const PJ_XY xy = ref.forward(lat, lon);
+      EXPECT_NEAR(std::stod(f[1]) * ref.toMeters, xy.y * ref.toMeters, z.tolerance);
+      EXPECT_NEAR(std::stod(f[2]) * ref.toMeters, xy.x * ref.toMeters, z.tolerance);
+      fac = ref.factors(lat, lon);
+      EXPECT_NEAR(PackedDegrees(f[7]) * 3600, fac.meridian_convergence / kDeg * 3600, convergence);
+      EXPECT_NEAR(std::stod(f[8]), fac.meridional_scale, 2e-8);
+      for (int k : {3, 4, 5, 6, 9, 10, 11, 12}) EXPECT_EQ(f[k], "") << k;
+    }
+  }
+
+  // A metre zone asked in U.S. survey feet: lengths stay in feet in the
+  // answer, as line 9 says, although the projection computed in metres; a
+  // point far off the zone is answered too.
+  V request = Header("Plane", "UTM NAD 83", "Zone 13N", "F");
+  request.push_back("A,11724000.0000,1873400.0000,100,,,");
+  request.push_back("B,12.3,45.6,,,,");
+  const Result r = run(request);
+  ASSERT_EQ(r.answer.size(), 14u) << r.err;
+  EXPECT_EQ(r.answer[8], "F");
+  EXPECT_EQ(r.answer[12].rfind("A,11724000.0000,1873400.0000,100.0000,,,,", 0), 0u) << r.answer[12];
+  EXPECT_EQ(r.answer[13].rfind("B,12.3000,45.6000,,,,,", 0), 0u) << r.answer[13];
 }
 
-TEST_F(BatchExchangeTest, GeographicPointsAreAnsweredInTheZone) {
-  // NGS SPCS83 example, New Mexico Central, in U.S. survey feet.
-  auto lines =
-      Header("Automatic", "Geographic", "State Plane 1983", "New Mexico Central 3002", "F");
-  lines.push_back("NM,32.1652339690,106.4515776360,");
-  ASSERT_TRUE(exchange(lines)) << ui.onlyText();
-  auto out = answer();
-  ASSERT_EQ(out.size(), 13u);
-  EXPECT_EQ(
-      std::vector<std::string>(out.begin() + 2, out.begin() + 12),
-      (std::vector<std::string>{"Automatic", "Plane", "State Plane 1983", "New Mexico Central 3002",
-                                "NAD 83", "NAVD 88", "F", "Meters", "", ""}));
-  // N 142158.262 m, E 452489.852 m, convergence -0 16 09.78, scale 0.99992783.
-  std::vector<std::string> f = Fields(out[12]);
-  ASSERT_EQ(f.size(), 13u) << out[12];
-  EXPECT_EQ(f[0], "NM");
-  EXPECT_NEAR(std::stod(f[1]) * 0.3048006096012192, 142158.262, 0.001);
-  EXPECT_NEAR(std::stod(f[2]) * 0.3048006096012192, 452489.852, 0.001);
-  EXPECT_EQ(f[7], "-0.16098");
-  EXPECT_NEAR(std::stod(f[8]), 0.99992783, 1.1e-8);
-  for (int i : {3, 4, 5, 6, 9, 10, 11, 12}) EXPECT_EQ(f[i], "") << i;
+TEST_F(BatchExchangeTest, GeoidHeightsFromTheGeoidProgram) {
+  // GEOID09 over New Mexico: N = -25 + 0.5 (lat - 31) - 0.2 (lon - 250).
+  const auto n = [](double lat, double lon) {
+    return -25.0 + 0.5 * (lat - 31) - 0.2 * (lon - 250);
+  };
+  test::SaveGeoidGrid(app.file("NGS/GEOID/g2009u03.bin"),
+                      test::MakeGeoidGrid(31, 250, 1.0 / 60, 301, 361, n));
+  V request = Header("Geographic", "State Plane 1983", "New Mexico Central 3002", "F", "GEOID09");
+  request.push_back("NM,32.1652339690,106.4515776360,1500");
+  const Result r = run(request);
+  ASSERT_EQ(r.status, 0) << r.err;
+  ASSERT_EQ(r.answer.size(), 13u);
+  EXPECT_EQ(r.answer[11], "GEOID09");
+  const V f = Fields(r.answer[12]);
+  const double lat = 32 + 16 / 60.0 + 52.33969 / 3600;
+  const double lon = 360 - (106 + 45 / 60.0 + 15.77636 / 3600);
+  // Metres from the program, in the request's vertical units (metres); the
+  // ellipsoid height is H + N.
+  EXPECT_NEAR(std::stod(f[9]), n(lat, lon), 0.0006) << r.answer[12];
+  EXPECT_EQ(f[3], "1500.0000");
+  EXPECT_NEAR(std::stod(f[12]), 1500 + n(lat, lon), 0.0006) << r.answer[12];
+  for (const char* left : {"geoid.con", "geoid.inp", "geoid.bat", "geoid.out", "junk"})
+    EXPECT_FALSE(fs::exists(app.file(std::string("NGS/GEOID/") + left))) << left;
+}
+
+TEST_F(BatchExchangeTest, BrokenRequestsAreRefusedByLineAndLeaveNoAnswer) {
+  app.write("tccout.tmp", "old\r\n");
+  V request = Header("Plane", "UTM NAD 83", "Zone 13N");
+  request.push_back("P1,100,200,,,,");
+  request.push_back("P2,100;200");
+  const Result r = run(request);
+  EXPECT_EQ(r.status, 1);
+  EXPECT_EQ(r.err,
+            "exclamation: Invalid Coordinate Request\nLine 14 of tccin.tmp has 2 fields; a grid "
+            "point needs 7: name, northing, easting, height, northing error, easting error and "
+            "elevation error.\nP2,100;200\n\n");
+  EXPECT_FALSE(fs::exists(app.file("tccout.tmp")));
+
+  const auto with = [](const std::string& kind, const std::string& line) {
+    V lines = Header(kind, "UTM NAD 83", "Zone 13N");
+    lines.push_back(kind == "Plane" ? "OK,1,2,3,,," : "OK,45.30,105.0,");
+    lines.push_back(line);
+    return lines;
+  };
+  const std::string invalid = "Invalid Coordinate Request";
+  const struct {
+    V request;
+    std::string message, title;
+  } cases[] = {
+      {with("Plane", "A,1,2O5,,,,"),
+       "Line 14 of tccin.tmp gives the easting '2O5', not a number.\r\nA,1,2O5,,,,", invalid},
+      {with("Plane", "A,,2,,,,"),
+       "Line 14 of tccin.tmp gives the northing '', not a number.\r\nA,,2,,,,", invalid},
+      {with("Plane", "A,1,2,3,x,,"),
+       "Line 14 of tccin.tmp gives the northing error 'x', not a number.\r\nA,1,2,3,x,,", invalid},
+      {with("Geographic", "A,45.30"),
+       "Line 14 of tccin.tmp has 2 fields; a geographic point needs 4: name, latitude, "
+       "longitude and height.\r\nA,45.30",
+       invalid},
+      {with("Geographic", "A,45.30,W90,"),
+       "Line 14 of tccin.tmp gives the longitude 'W90', not a number.\r\nA,45.30,W90,", invalid},
+      // An angle outside its limits is refused after its own message.
+      {with("Geographic", "A,45.6000,105.0,"),
+       "Invalid Angle '45.6000'. Minutes portion must be positive and not exceed 59.\r\n"
+       "Line 14 of tccin.tmp gives the latitude '45.6000', not a valid angle.\r\n"
+       "A,45.6000,105.0,",
+       "Invalid Angle"},
+      {Header("Plane", "UTM NAD 83", "Zone 13N", "Feet"),
+       "Line 9 of tccin.tmp gives the horizontal units 'Feet'; they must be F, M or I.", invalid},
+      {{"only", "three", "lines"},
+       "tccin.tmp holds 3 lines; a coordinate request starts with 12 header lines.",
+       invalid},
+      {Header("Plane", "UTM NAD 83", "Atlantis"),
+       "Unable to determine Coordinate System and Zone. Can not compute Latitude, Longitude, "
+       "Scale Factor, or Convergence Angle.",
+       "VORN Zurevazidu Error"},
+  };
+  for (const auto& c : cases) {
+    ui.boxes.clear();
+    EXPECT_FALSE(exchange(c.request)) << c.message;
+    std::string text;
+    for (const auto& box : ui.boxes) text += (text.empty() ? "" : "\r\n") + box.text;
+    EXPECT_EQ(text, c.message);
+    ASSERT_FALSE(ui.boxes.empty());
+    EXPECT_EQ(ui.boxes[0].title, c.title);
+    EXPECT_FALSE(fs::exists(app.file("tccout.tmp"))) << c.message;
+  }
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);  // the zone's
 }
 
 TEST_F(BatchExchangeTest, ZoneLookup) {
   app.write("zones.ini",
-            CrLf({"[SP~North]", "Horizontal Datum=NAD 83 (HARN)", "[Other~North]",
-                  "Horizontal Datum=NAD 83", "[SP~North Two]", "Horizontal Datum=NAD 83 (CORS)",
-                  "[SP~South]", "Horizontal Datum=NAD 27", "[X~Far]", "Horizontal Datum=NAD 83 (A)",
-                  "[Y~Far]", "Horizontal Datum=NAD 83 (B)", "[Z~Far]", "Horizontal Datum=NAD 83"}));
-  const std::string a = app.path();
-  EXPECT_EQ(FindExchangeZone(a, "SP", "South", "NAD 27"), "SP~South");
-  // The named section with another datum: walk the sections containing the
-  // zone name; an exact datum before the second partial match wins.
-  EXPECT_EQ(FindExchangeZone(a, "SP", "North", "NAD 83"), "Other~North");
-  EXPECT_EQ(FindExchangeZone(a, "Z", "Far", "NAD 83"), "Z~Far");
-  EXPECT_EQ(FindExchangeZone(a, "", "Far", "NAD 83"), "");  // exact only after two partial
-  EXPECT_EQ(FindExchangeZone(a, "", "South", "NAD 27"), "SP~South");
-  EXPECT_EQ(FindExchangeZone(a, "sp", "south", "NAD 27"), "SP~South");
-  EXPECT_EQ(FindExchangeZone(a, "SP", "North", "HARN"), "SP~North");  // one partial match
-  EXPECT_EQ(FindExchangeZone(a, "SP", "North", "NAD 8"), "");         // two partial matches
-  EXPECT_EQ(FindExchangeZone(a, "SP", "East", "NAD 83"), "");
-
-  ASSERT_FALSE(exchange(Header("Automatic", "Plane", "SP", "East")));
-  EXPECT_EQ(ui.onlyText(),
-            "Unable to determine Coordinate System and Zone. Can not compute Latitude, "
-            "Longitude, Scale Factor, or Convergence Angle.");
-  EXPECT_EQ(ui.boxes[0].title, "VORN Zurevazidu Error");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
-}
-
-TEST_F(BatchExchangeTest, RequestHeaderLines) {
-  std::vector<std::string> lines = Header("Automatic", "Plane", "SP", "North", "I");
-  lines[6] = "NAD 83";
-  lines[7] = "29";
-  lines[9] = "F";
-  lines.push_back("");
-  lines.push_back("A,1,2,3,,,");
-  std::istringstream in(CrLf(lines));
-  ExchangeRequest r;
-  ASSERT_TRUE(ReadExchangeRequest(ui, in, r, state));
-  EXPECT_TRUE(r.automatic);
-  EXPECT_TRUE(r.grid);
-  EXPECT_EQ(r.horizontalDatum, "NAD 83");
-  EXPECT_EQ(r.verticalDatum, "NGVD 29");
-  ASSERT_EQ(state.points.size(), 1u);
-  const SurveyPoint& p = state.points[0];
-  EXPECT_EQ(p.HorizontalUnits, kInternationalFeet);
-  EXPECT_EQ(p.VerticalUnits, kUsSurveyFeet);
-  EXPECT_EQ(p.Elevation, 3.0);
-  EXPECT_EQ(p.NorthingError, kNoValueF);
-
-  lines[2] = "automatic";
-  lines[3] = "Geographic";
-  lines[10] = "Ellipsoid";
-  lines.back() = "B,45.3015,90.0000,12.5";
-  std::istringstream geo(CrLf(lines));
-  ASSERT_TRUE(ReadExchangeRequest(ui, geo, r, state));
-  EXPECT_FALSE(r.automatic);
-  EXPECT_FALSE(r.grid);
-  EXPECT_NEAR(state.points[0].Latitude, (45 + 30 / 60.0 + 15 / 3600.0) * kDegreesToRadians, 1e-15);
-  EXPECT_EQ(state.points[0].EllipsoidHeight, 12.5);
-  EXPECT_EQ(state.points[0].Elevation, kNoValue);
-  EXPECT_TRUE(state.points[0].GridMissing);
-}
-
-TEST_F(BatchExchangeTest, BrokenPointLinesAreRefusedByLineAndLeaveNoAnswer) {
-  struct Case {
-    std::string kind, line, message;
+            test::Ini("[SP~North]|Horizontal Datum=NAD 83 (HARN)|[Other~North]|"
+                      "Horizontal Datum=NAD 83|[SP~North Two]|Horizontal Datum=NAD 83 (CORS)|"
+                      "[SP~South]|Horizontal Datum=NAD 27|[X~Far]|Horizontal Datum=NAD 83 (A)|"
+                      "[Y~Far]|Horizontal Datum=NAD 83 (B)|[Z~Far]|Horizontal Datum=NAD 83"));
+  const struct {
+    const char *system, *zone, *datum, *found;
+  } cases[] = {
+      {"SP", "South", "NAD 27", "SP~South"},
+      // The named section with another datum: walk the sections containing
+      // the zone name; an exact datum before the second partial match wins.
+      {"SP", "North", "NAD 83", "Other~North"},
+      {"Z", "Far", "NAD 83", "Z~Far"},
+      {"", "Far", "NAD 83", ""},  // exact only after two partial
+      {"", "South", "NAD 27", "SP~South"},
+      {"sp", "south", "NAD 27", "SP~South"},
+      {"SP", "North", "HARN", "SP~North"},  // one partial match
+      {"SP", "North", "NAD 8", ""},         // two partial matches
+      {"SP", "East", "NAD 83", ""},
   };
-  const Case cases[] = {
-      {"Plane", "A,1,2,3",
-       "Line 14 of tccin.tmp has 4 fields; a grid point needs 7: name, northing, easting, "
-       "height, northing error, easting error and elevation error.\r\nA,1,2,3"},
-      {"Plane", "A,1,2O5,,,,",
-       "Line 14 of tccin.tmp gives the easting '2O5', not a number.\r\nA,1,2O5,,,,"},
-      {"Plane", "A,,2,,,,",
-       "Line 14 of tccin.tmp gives the northing '', not a number.\r\nA,,2,,,,"},
-      {"Plane", "A,1,2,3,x,,",
-       "Line 14 of tccin.tmp gives the northing error 'x', not a number.\r\nA,1,2,3,x,,"},
-      {"Geographic", "A,45.30",
-       "Line 14 of tccin.tmp has 2 fields; a geographic point needs 4: name, latitude, "
-       "longitude and height.\r\nA,45.30"},
-      {"Geographic", "A,45.30,W90,",
-       "Line 14 of tccin.tmp gives the longitude 'W90', not a number.\r\nA,45.30,W90,"},
-  };
-  for (const Case& c : cases) {
-    app.write("tccout.tmp", "previous answer\r\n");
-    ui.boxes.clear();
-    auto lines = Header("Automatic", c.kind, "UTM NAD 83", "Zone 13N");
-    lines.push_back("OK,1,2,3,,,");
-    lines.push_back(c.line);
-    if (c.kind == "Geographic") lines[12] = "OK,45.30,105.0,";
-    EXPECT_FALSE(exchange(lines)) << c.line;
-    EXPECT_EQ(ui.onlyText(), c.message);
-    EXPECT_EQ(ui.boxes[0].title, "Invalid Coordinate Request");
-    EXPECT_FALSE(fs::exists(app.file("tccout.tmp"))) << c.line;
+  for (const auto& c : cases) {
+    EXPECT_EQ(FindExchangeZone(app.path(), c.system, c.zone, c.datum), c.found)
+        << c.system << "~" << c.zone << " " << c.datum;
   }
-
-  // An angle outside its limits is refused after its own message.
-  ui.boxes.clear();
-  auto lines = Header("Automatic", "Geographic", "UTM NAD 83", "Zone 13N");
-  lines.push_back("A,45.6000,105.0,");
-  EXPECT_FALSE(exchange(lines));
-  ASSERT_EQ(ui.boxes.size(), 2u);
-  EXPECT_EQ(ui.boxes[0].title, "Invalid Angle");
-  EXPECT_EQ(ui.boxes[1].text,
-            "Line 13 of tccin.tmp gives the latitude '45.6000', not a valid angle.\r\n"
-            "A,45.6000,105.0,");
-
-  ui.boxes.clear();
-  EXPECT_FALSE(exchange(Header("Automatic", "Plane", "UTM NAD 83", "Zone 13N", "Feet")));
-  EXPECT_EQ(ui.onlyText(),
-            "Line 9 of tccin.tmp gives the horizontal units 'Feet'; they must be F, M or I.");
-  ui.boxes.clear();
-  EXPECT_FALSE(exchange({"only", "three", "lines"}));
-  EXPECT_EQ(ui.onlyText(),
-            "tccin.tmp holds 3 lines; a coordinate request starts with 12 header lines.");
 }
 
 TEST_F(BatchExchangeTest, ManualModeNeedsTheConversionWindow) {
-  app.write("tccout.tmp", "previous answer\r\n");
-  auto lines = Header("automatic", "Plane", "UTM NAD 83", "Zone 13N");
-  lines.push_back("A,1,2,,,,");
+  // Not "Automatic" (letter case counts); NGVD 29, international feet and
+  // ellipsoid heights.
+  V lines = Header("Geographic", "UTM NAD 83", "Zone 13N", "I");
+  lines[2] = "automatic";
+  lines[7] = "29";
+  lines[10] = "Ellipsoid";
+  lines.push_back("B,45.3015,90.0000,12.5");
   EXPECT_FALSE(exchange(lines));
   EXPECT_EQ(ui.onlyText(),
             "The coordinate request in tccin.tmp asks for the manual mode (its line 3 is not "
@@ -270,44 +347,30 @@ TEST_F(BatchExchangeTest, ManualModeNeedsTheConversionWindow) {
   EXPECT_FALSE(fs::exists(app.file("tccout.tmp")));
 
   // With a window: its settings and result are answered as "Manual".
-  ConversionSettings seen;
-  ManualConversion window = [&](ConversionState& s) {
-    seen = s.settings;
+  ConversionState seen;
+  const ManualConversion window = [&](ConversionState& s) {
+    seen = s;
     s.settings.outputCoordinateSystem = "Chosen";
     s.batchGrid = false;
     return true;
   };
   ASSERT_TRUE(exchange(lines, window));
-  EXPECT_EQ(seen.inputCoordinateSystem, "UTM NAD 83");
-  EXPECT_EQ(seen.inputZone, "Zone 13N");
-  EXPECT_EQ(seen.inputHorizontalDatum, "NAD 83");
-  EXPECT_EQ(seen.inputVerticalDatum, "NAVD 88");
-  EXPECT_EQ(seen.inputHorizontalUnits, kMeters);
-  auto out = answer();
-  ASSERT_GE(out.size(), 5u);
-  EXPECT_EQ(out[2], "Manual");
-  EXPECT_EQ(out[3], "Geographic");
-  EXPECT_EQ(out[4], "Chosen");
+  EXPECT_EQ(seen.settings.inputCoordinateSystem, "UTM NAD 83");
+  EXPECT_EQ(seen.settings.inputZone, "Zone 13N");
+  EXPECT_EQ(seen.settings.inputHorizontalDatum, "NAD 83");
+  EXPECT_EQ(seen.settings.inputVerticalDatum, "NGVD 29");
+  ASSERT_EQ(seen.points.size(), 1u);
+  EXPECT_NEAR(seen.points[0].Latitude, (45 + 30 / 60.0 + 15 / 3600.0) * kDegreesToRadians, 1e-15);
+  EXPECT_EQ(seen.points[0].EllipsoidHeight, 12.5);
+  EXPECT_EQ(seen.points[0].Elevation, kNoValue);
+  EXPECT_EQ(seen.points[0].VerticalUnits, kMeters);
+  V answer;
+  ASSERT_TRUE(ReadTextLines(app.file("tccout.tmp"), answer));
+  ASSERT_GE(answer.size(), 5u);
+  EXPECT_EQ(V(answer.begin() + 2, answer.begin() + 5), (V{"Manual", "Geographic", "Chosen"}));
 
   EXPECT_FALSE(exchange(lines, [](ConversionState&) { return false; }));
   EXPECT_FALSE(fs::exists(app.file("tccout.tmp")));
-}
-
-TEST_F(BatchExchangeTest, GeographicRequestWithGeoidModel) {
-  test::InstallAllStandIns(app.path());
-  test::SaveGeoidGrid(
-      app.file("NGS/GEOID/g2009u03.bin"),
-      test::MakeGeoidGrid(30, 250, 0.5, 20, 20, [](double, double) { return -21.5; }));
-  auto lines = Header("Automatic", "Geographic", "UTM NAD 83", "Zone 13N", "M", "GEOID09");
-  lines.push_back("G,35.0,105.0,1500");
-  ASSERT_TRUE(exchange(lines)) << ui.onlyText();
-  auto out = answer();
-  ASSERT_EQ(out.size(), 13u);
-  EXPECT_EQ(out[11], "GEOID09");
-  // On the central meridian: easting 500000, convergence 0, scale 0.9996;
-  // the ellipsoid height is H + N.
-  EXPECT_EQ(out[12].substr(out[12].find(",500000.0000,")),
-            ",500000.0000,1500.0000,,,,0.00000,0.99960000,-21.5000,,,1478.5000");
 }
 
 }  // namespace

@@ -24,14 +24,7 @@ double Dms(double d, double m, double s) {
 }
 
 std::tm FixedTime() {
-  std::tm t{};
-  t.tm_year = 2026 - 1900;
-  t.tm_mon = 2;
-  t.tm_mday = 4;
-  t.tm_hour = 9;
-  t.tm_min = 5;
-  t.tm_sec = 7;
-  return t;
+  return std::tm{7, 5, 9, 4, 2, 126, 0, 0, 0, 0, nullptr};  // 03/04/2026 9:05:07
 }
 
 SurveyPoint Geographic(const std::string& name, double lat, double lon) {
@@ -66,9 +59,8 @@ class ConversionDriverTest : public ::testing::Test {
 };
 
 TEST_F(ConversionDriverTest, HorizontalDatumsWithoutMethodAskOrRefuse) {
-  app.write("datums.ini",
-            test::CrLf({"[NAD 83]", "Ellipsoid=GRS 80", "WGS 84=Same frame", "[WGS 84]",
-                        "Ellipsoid=GRS 80", "[Local]", "Ellipsoid=Clarke 1866"}));
+  app.write("datums.ini", test::Ini("[NAD 83]|Ellipsoid=GRS 80|WGS 84=Same frame|[WGS 84]|"
+                                    "Ellipsoid=GRS 80|[Local]|Ellipsoid=Clarke 1866"));
   std::vector<SurveyPoint> points{Geographic("A", 0.7, 1.6)};
   // Any method other than NADCON is a pair that needs no shift.
   EXPECT_TRUE(HorizontalDatumTransformation(ui, app.path(), points, "NAD 83", "WGS 84"));
@@ -100,26 +92,37 @@ TEST_F(ConversionDriverTest, HorizontalDatumsWithoutMethodAskOrRefuse) {
   EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
 }
 
-TEST_F(ConversionDriverTest, GeographicToGeographicAcrossDatumsRunsNadcon) {
+// The datum shift comes before the projection: NAD 27 coordinates into a
+// NAD 83 zone through the stand-in NADCON, shifts +0.5" and -1.25" (west).
+TEST_F(ConversionDriverTest, DatumShiftIntoAZone) {
   test::InstallAllStandIns(app.path());
-  auto las = [](double, double) { return 0.5; };
-  auto los = [](double, double) { return -1.25; };
   const std::string folder = app.file("NGS/NADCON/");
-  test::SaveShiftGrid(folder + "conus.las", test::MakeShiftGrid(-120, 30, 1, 40, 20, las));
-  test::SaveShiftGrid(folder + "conus.los", test::MakeShiftGrid(-120, 30, 1, 40, 20, los));
+  test::SaveShiftGrid(folder + "conus.las",
+                      test::MakeShiftGrid(-120, 30, 1, 40, 20, [](double, double) { return 0.5; }));
+  test::SaveShiftGrid(
+      folder + "conus.los",
+      test::MakeShiftGrid(-120, 30, 1, 40, 20, [](double, double) { return -1.25; }));
+  const double lat = Dms(32, 16, 52), lon = Dms(106, 45, 14);
+  std::vector<SurveyPoint> shifted{Geographic("A", lat + Dms(0, 0, 0.5), lon - Dms(0, 0, 1.25))};
+  ASSERT_TRUE(GeographicToGrid(ui, app.path(), shifted, "State Plane 1983",
+                               "New Mexico Central 3002", "NAD 83", kMeters));
 
-  state.points = {Geographic("A", Dms(40, 30, 0), Dms(100, 15, 0))};
+  state.points = {Geographic("A", lat, lon)};
   state.points[0].Elevation = 10;
   ConversionSettings& s = state.settings;
-  s.inputCoordinateSystem = s.outputCoordinateSystem = kGeographicCoordinates;
+  s.inputCoordinateSystem = kGeographicCoordinates;
+  s.outputCoordinateSystem = "State Plane 1983";
+  s.outputZone = "New Mexico Central 3002";
   s.inputHorizontalDatum = "NAD 27";
   s.outputHorizontalDatum = "NAD 83";
+  s.outputHorizontalUnits = kMeters;
   s.inputVerticalDatum = s.outputVerticalDatum = "NGVD 29";
   s.inputVerticalUnits = kMeters;
   s.outputVerticalUnits = kUsSurveyFeet;
   ASSERT_TRUE(ConvertPoints(ui, app.path(), state)) << ui.onlyText();
-  EXPECT_NEAR(state.points[0].Latitude, Dms(40, 30, 0.5), 2e-11);
-  EXPECT_NEAR(state.points[0].Longitude, Dms(100, 15, -1.25), 2e-11);
+  EXPECT_NEAR(state.points[0].Latitude, shifted[0].Latitude, 2e-11);
+  EXPECT_NEAR(state.points[0].Northing, shifted[0].Northing, 0.001);
+  EXPECT_NEAR(state.points[0].Easting, shifted[0].Easting, 0.001);
   EXPECT_DOUBLE_EQ(state.points[0].Elevation, 10 * 3.2808333333333333);
   EXPECT_EQ(state.points[0].VerticalUnits, kUsSurveyFeet);
   EXPECT_TRUE(ui.boxes.empty());
@@ -185,39 +188,31 @@ TEST_F(ConversionDriverTest, GeoidHeightsFillTheMissingHeight) {
   for (const SurveyPoint& p : points) EXPECT_EQ(p.GeoidHeight, -30.25);
 }
 
-TEST_F(ConversionDriverTest, ProjectsOverTheShippedZones) {
+TEST_F(ConversionDriverTest, ProjectsOverTheShippedZonesInTheAskedUnits) {
   // NGS SPCS83 example, New Mexico Central: N 142158.262, E 452489.852 m,
-  // convergence -0 16 09.78, scale 0.99992783.
+  // convergence -0 16 09.78, scale 0.99992783; given south-positive, with
+  // an error in international feet, asked in U.S. survey feet.
   const double lat = Dms(32, 16, 52.33969), lon = Dms(106, 45, 15.77636);
-  std::vector<SurveyPoint> points{Geographic("NM", lat, lon), Geographic("NONE", kNoValue, lon)};
-  points[0].NorthingError = 0.1f;
-  points[0].HorizontalUnits = kMeters;
-  ASSERT_TRUE(GeographicToGrid(ui, app.path(), points, "State Plane 1983",
-                               "New Mexico Central 3002", "NAD 83", kMeters));
-  EXPECT_NEAR(points[0].Northing, 142158.262, 0.001);
-  EXPECT_NEAR(points[0].Easting, 452489.852, 0.001);
-  EXPECT_NEAR(points[0].Convergence, -Dms(0, 16, 9.78), 0.01 / 3600 * kDeg);
-  EXPECT_NEAR(points[0].ScaleFactor, 0.99992783, 1e-8);
-  EXPECT_FLOAT_EQ(points[0].NorthingError, 0.1f);
-  EXPECT_FALSE(points[0].GridMissing);
-  EXPECT_EQ(points[1].Northing, kNoValue);
-  EXPECT_EQ(points[1].Easting, kNoValue);
-
-  // The same point in U.S. survey feet, with an error in international
-  // feet, and given with its latitude south-positive.
-  std::vector<SurveyPoint> feet{Geographic("NM", -lat, lon)};
+  std::vector<SurveyPoint> feet{Geographic("NM", -lat, lon), Geographic("NONE", kNoValue, lon)};
   feet[0].LatitudeHemisphere = "S";
   feet[0].HorizontalUnits = kInternationalFeet;
   feet[0].EastingError = 1.0f;
   ASSERT_TRUE(GeographicToGrid(ui, app.path(), feet, "State Plane 1983", "New Mexico Central 3002",
                                "NAD 83", kUsSurveyFeet));
   EXPECT_NEAR(feet[0].Northing * kUsFoot, 142158.262, 0.001);
+  EXPECT_NEAR(feet[0].Easting * kUsFoot, 452489.852, 0.001);
+  EXPECT_NEAR(feet[0].Convergence, -Dms(0, 16, 9.78), 0.01 / 3600 * kDeg);
+  EXPECT_NEAR(feet[0].ScaleFactor, 0.99992783, 1e-8);
   EXPECT_FLOAT_EQ(feet[0].EastingError, 0.999998f);
   EXPECT_EQ(feet[0].HorizontalUnits, kUsSurveyFeet);
   EXPECT_EQ(feet[0].LatitudeHemisphere, "N");
   EXPECT_DOUBLE_EQ(feet[0].Latitude, lat);
+  EXPECT_FALSE(feet[0].GridMissing);
+  EXPECT_EQ(feet[1].Northing, kNoValue);
+  EXPECT_EQ(feet[1].Easting, kNoValue);
 
   // And back: northing and easting go to the projection's metres first.
+  feet.pop_back();
   ASSERT_TRUE(GridToGeographic(ui, app.path(), feet, "State Plane 1983", "New Mexico Central 3002",
                                "NAD 83"));
   EXPECT_NEAR(feet[0].Latitude, lat, 1e-10);
@@ -277,12 +272,11 @@ TEST_F(ConversionDriverTest, UnusableZonesAreReported) {
 
   // A cone whose mapping radius does not compute gives no coordinates.
   app.write("zones.ini",
-            test::CrLf({"[Bad~Cone]", "Horizontal Datum=NAD 83",
-                        "Projection=Lambert Conformal Conic - Two Parallels",
-                        "Central Latitude=40.0", "Central Longitude=100.0", "False Northing=0",
-                        "False Easting=0", "Northern Parallel=45.0", "Southern Parallel=45.0",
-                        "Positive Latitude Direction=N", "Positive Longitude Direction=W",
-                        "Linear Units=Meters"}));
+            test::Ini("[Bad~Cone]|Horizontal Datum=NAD 83|"
+                      "Projection=Lambert Conformal Conic - Two Parallels|Central Latitude=40.0|"
+                      "Central Longitude=100.0|False Northing=0|False Easting=0|"
+                      "Northern Parallel=45.0|Southern Parallel=45.0|Positive Latitude Direction=N|"
+                      "Positive Longitude Direction=W|Linear Units=Meters"));
   ui.boxes.clear();
   EXPECT_FALSE(GeographicToGrid(ui, app.path(), points, "Bad", "Cone", "NAD 83", kMeters));
   EXPECT_EQ(ui.onlyText(), "Error - Mapping Radius does not compute properly");
@@ -292,20 +286,14 @@ TEST_F(ConversionDriverTest, UnusableZonesAreReported) {
 
 // A zone whose origin is the test point: northing and easting are the false
 // origin, convergence 0, scale factor the zone's.
-const char* kOriginZone[] = {"[Test Grid~Origin]",
-                             "Horizontal Datum=NAD 83",
-                             "Projection=Transverse Mercator",
-                             "Central Latitude=45.000000000",
-                             "Central Longitude=90.000000000",
-                             "False Northing=1000",
-                             "False Easting=500000",
-                             "Scale Factor=0.9999",
-                             "Positive Latitude Direction=N",
-                             "Positive Longitude Direction=W",
-                             "Linear Units=Meters"};
+const std::string kOriginZone = test::Ini(
+    "[Test Grid~Origin]|Horizontal Datum=NAD 83|Projection=Transverse Mercator|"
+    "Central Latitude=45.000000000|Central Longitude=90.000000000|False Northing=1000|"
+    "False Easting=500000|Scale Factor=0.9999|Positive Latitude Direction=N|"
+    "Positive Longitude Direction=W|Linear Units=Meters");
 
 TEST_F(ConversionDriverTest, SinglePointReportGeographicToGrid) {
-  app.write("zones.ini", test::CrLf({std::begin(kOriginZone), std::end(kOriginZone)}));
+  app.write("zones.ini", kOriginZone);
   state.singlePoint = true;
   state.points = {Geographic("BM 1", 45 * kDeg, 90 * kDeg)};
   state.points[0].Elevation = 123.4567;
@@ -348,7 +336,7 @@ TEST_F(ConversionDriverTest, SinglePointReportGeographicToGrid) {
 }
 
 TEST_F(ConversionDriverTest, SinglePointReportGridToGeographicWithGeoid) {
-  app.write("zones.ini", test::CrLf({std::begin(kOriginZone), std::end(kOriginZone)}));
+  app.write("zones.ini", kOriginZone);
   test::InstallAllStandIns(app.path());
   test::SaveGeoidGrid(
       app.file("NGS/GEOID/g2009u05.bin"),

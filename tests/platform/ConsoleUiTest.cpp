@@ -30,20 +30,18 @@ TEST(ConsoleUiTest, AnswersAndTheirSafeDefaults) {
   Console yes(" YES\r\n");
   EXPECT_EQ(yes.ui.message("Overwrite?", Icon::None, Buttons::YesNo, "T"), Answer::Yes);
   EXPECT_NE(yes.err.str().find("none: T\nOverwrite?\n\n[Yes/No]? "), std::string::npos);
-
-  Console eof("");
-  EXPECT_EQ(eof.ui.message("Q", Icon::None, Buttons::YesNo, "T"), Answer::No);
-  EXPECT_EQ(eof.ui.message("Q", Icon::None, Buttons::YesNoCancel, "T"), Answer::Cancel);
-
-  Console junk("maybe\nperhaps\nwhat\ny\n");  // three unreadable answers
-  EXPECT_EQ(junk.ui.message("Q", Icon::None, Buttons::YesNo, "T"), Answer::No);
-
-  Console retry("x\nc\n");
-  EXPECT_EQ(retry.ui.message("Q", Icon::None, Buttons::OkCancel, "T"), Answer::Cancel);
-  Console ok("o\n");
-  EXPECT_EQ(ok.ui.message("Q", Icon::None, Buttons::OkCancel, "T"), Answer::Ok);
-  Console noCancel("c\nn\n");  // Cancel is not offered on Yes/No
-  EXPECT_EQ(noCancel.ui.message("Q", Icon::None, Buttons::YesNo, "T"), Answer::No);
+  const std::tuple<const char*, Buttons, Answer> cases[] = {
+      {"", Buttons::YesNo, Answer::No},  // end of input
+      {"", Buttons::YesNoCancel, Answer::Cancel},
+      {"maybe\nperhaps\nwhat\ny\n", Buttons::YesNo, Answer::No},  // three unreadable answers
+      {"x\nc\n", Buttons::OkCancel, Answer::Cancel},
+      {"o\n", Buttons::OkCancel, Answer::Ok},
+      {"c\nn\n", Buttons::YesNo, Answer::No},  // Cancel is not offered on Yes/No
+  };
+  for (const auto& [answers, buttons, expected] : cases) {
+    Console c(answers);
+    EXPECT_EQ(c.ui.message("Q", Icon::None, buttons, "T"), expected) << answers;
+  }
 }
 
 TEST(ConsoleUiTest, InputBoxAndTextViewer) {

@@ -35,21 +35,13 @@ TEST(NumbersTest, FixedFormatsRoundAndNeverShowNegativeZero) {
   EXPECT_EQ(FormatGrouped(1234567.891, 2), "1,234,567.89");
   EXPECT_EQ(FormatGrouped(-999.5, 0), "-1,000");
   EXPECT_EQ(FormatGrouped(12.0, 1), "12.0");
-}
-
-TEST(NumbersTest, PlainDecimalExpandsExponents) {
+  // Plain decimals expand exponents.
   EXPECT_EQ(FormatPlainDecimal(0.0033528106647474805), "0.0033528106647474805");
   EXPECT_EQ(FormatPlainDecimal(1e-7), "0.0000001");
   EXPECT_EQ(FormatPlainDecimal(1e21), "1000000000000000000000");
   EXPECT_EQ(FormatPlainDecimal(-0.0), "0");
   EXPECT_EQ(FormatPlainDecimal(12.5), "12.5");
 }
-
-}  // namespace
-}  // namespace zv
-
-namespace zv {
-namespace {
 
 // The fast fixed formatting must give the text of the exact decimal expansion.
 TEST(NumbersTest, FastFixedMatchesExactRoundingIncludingTies) {

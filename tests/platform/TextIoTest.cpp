@@ -13,6 +13,8 @@
 namespace zv {
 namespace {
 
+using namespace std::string_literals;
+
 std::vector<std::string> Lines(const std::string& text) {
   std::istringstream in(text);
   LineReader reader(in);
@@ -22,48 +24,35 @@ std::vector<std::string> Lines(const std::string& text) {
   return lines;
 }
 
-TEST(TextIoTest, ReadsCrLfLfAndCrAloneAndSkipsAUtf8Mark) {
+TEST(TextIoTest, ReadsCrLfLfAndCrAloneSkipsAUtf8MarkAndKnowsUtf16) {
   using L = std::vector<std::string>;
-  EXPECT_EQ(Lines("a\r\nb\nc"), (L{"a", "b", "c"}));
-  EXPECT_EQ(Lines("a\r\n\r\nb\r\n"), (L{"a", "", "b"}));
-  EXPECT_EQ(Lines(""), L{});
-  EXPECT_EQ(Lines("x\r"), L{"x"});
-  EXPECT_EQ(Lines(std::string("n\0ul\n", 5)), L{std::string("n\0ul", 4)});
-  EXPECT_EQ(Lines("PN:1\rPN:2\r\rPN:3"), (L{"PN:1", "PN:2", "", "PN:3"}));
-  EXPECT_EQ(Lines("a\rb\nc\r\nd\n\re"), (L{"a", "b", "c", "d", "", "e"}));
-  EXPECT_EQ(Lines("\xEF\xBB\xBFPN:1\r\n\xEF\xBB\xBF"), (L{"PN:1", "\xEF\xBB\xBF"}));
-  // A CR LF split between two reads is one line end.
-  std::string first(64 << 10, 'q');
-  first.back() = '\r';
-  auto split = Lines(first + "\nz");
-  ASSERT_EQ(split.size(), 2u);
-  EXPECT_EQ(split[1], "z");
+  const std::pair<std::string, L> cases[] = {
+      {"a\r\nb\nc", {"a", "b", "c"}},
+      {"a\r\n\r\nb\r\n", {"a", "", "b"}},
+      {"", {}},
+      {"x\r", {"x"}},
+      {"n\0ul\n"s, {"n\0ul"s}},
+      {"PN:1\rPN:2\r\rPN:3", {"PN:1", "PN:2", "", "PN:3"}},
+      {"a\rb\nc\r\nd\n\re", {"a", "b", "c", "d", "", "e"}},
+      {"\xEF\xBB\xBFPN:1\r\n\xEF\xBB\xBF", {"PN:1", "\xEF\xBB\xBF"}},
+      // A CR LF split between two reads is one line end.
+      {std::string((64 << 10) - 1, 'q') + "\r\nz", {std::string((64 << 10) - 1, 'q'), "z"}},
+      // Lines longer than the read chunk stay whole.
+      {"a\n" + std::string(3 << 20, 'q') + "\r\nz", {"a", std::string(3 << 20, 'q'), "z"}},
+  };
+  for (const auto& [text, lines] : cases) EXPECT_EQ(Lines(text), lines) << text.substr(0, 20);
   // Long files without LF stay fast: a million CR lines.
   std::string many;
   for (int i = 0; i < 1000000; ++i) many += "PN:1\r";
   EXPECT_EQ(Lines(many).size(), 1000000u);
-}
 
-TEST(TextIoTest, RecognisesUtf16) {
-  EXPECT_TRUE(LooksLikeUtf16("\xFF\xFEP"));
-  EXPECT_TRUE(LooksLikeUtf16("\xFE\xFF"));
-  EXPECT_TRUE(
-      LooksLikeUtf16(std::string("P\0N\0:\0"
-                                 "1\0\r\0\n\0",
-                                 12)));
-  EXPECT_TRUE(LooksLikeUtf16(std::string("\0P\0N\0:", 6)));
+  for (const std::string& wide :
+       {"\xFF\xFEP"s, "\xFE\xFF"s, "P\0N\0:\0001\0\r\0\n\0"s, "\0P\0N\0:"s})
+    EXPECT_TRUE(LooksLikeUtf16(wide)) << wide;
   EXPECT_FALSE(LooksLikeUtf16("PN:1\r\n"));
-  EXPECT_FALSE(LooksLikeUtf16(std::string("\0\0\0\0ab", 6)));  // binary, not text
-  std::istringstream in(std::string("\xFF\xFEP\0", 4));
+  EXPECT_FALSE(LooksLikeUtf16("\0\0\0\0ab"s));  // binary, not text
+  std::istringstream in("\xFF\xFEP\0"s);
   EXPECT_TRUE(LineReader(in).isUtf16());
-}
-
-TEST(TextIoTest, LinesLongerThanTheReadChunkStayWhole) {
-  std::string big(3 << 20, 'q');
-  auto lines = Lines("first\n" + big + "\r\nlast\n");
-  ASSERT_EQ(lines.size(), 3u);
-  EXPECT_EQ(lines[1].size(), big.size());
-  EXPECT_EQ(lines[2], "last");
 }
 
 TEST(TextIoTest, WriterUsesCrLfAndReplacesOnlyOnCommit) {

@@ -9,7 +9,6 @@ namespace zv {
 namespace {
 
 using test::Fixture;
-using test::TempDir;
 using Lines = std::vector<std::string>;
 
 Lines FixtureLines(const std::string& name) {
@@ -24,7 +23,8 @@ std::string Numbers(int first, int last) {
   return out;
 }
 
-TEST(SurveyListing, ControlRecordsAreSeparatedByEmptyLines) {
+TEST(SurveyListing, RecordViewOfFixtures) {
+  // Control records are separated by empty lines, other record codes not.
   Lines list = FixtureLines("control.lst");
   Lines record = ListToRecord(list);
   EXPECT_EQ(record, Lines({"PR:Job 12", "AC:PR  VR:VORN Zurevazidu 1.0.0  UL:M", "",
@@ -32,23 +32,17 @@ TEST(SurveyListing, ControlRecordsAreSeparatedByEmptyLines) {
                            "AC:OS  PN:2  YC:1010.0000  XC:2010.0000  ZC:101.0000",
                            "       PD:Iron pin found in the north east corner of the lot  FE:IP"}));
   EXPECT_EQ(RecordToList(record), list);
-
-  // Other record codes get no empty line, and none starts the view.
   EXPECT_EQ(ListToRecord({"AC:OS", "PN:1", "AC:SS", "PN:2"}),
             Lines({"AC:OS  PN:1", "AC:SS  PN:2"}));
-}
 
-TEST(SurveyListing, LongPointListsWrapAtCommas) {
-  Lines list = FixtureLines("long_point_list.lst");
-  Lines record = ListToRecord(list);
+  // Long point lists wrap at commas below 80; back in the list view the
+  // joined list is cut into PL lines below 78.
+  record = ListToRecord(FixtureLines("long_point_list.lst"));
   EXPECT_EQ(
       record,
       Lines({"AC:PR", "BG:BEGIN CHAIN LIST", "AC:CH  FE:EP  PL:" + Numbers(1000, 1011) + ",",
              "       PL:" + Numbers(1012, 1024) + ",", "       PL:" + Numbers(1025, 1037) + ",",
              "       PL:1038,1039  CH:A", "EG:END CHAIN LIST", "CP:05/07/2024 9:05:03"}));
-  for (const std::string& l : record) EXPECT_LT(l.size(), 80u) << l;
-
-  // Back in the list view the joined list is cut into PL lines below 78.
   EXPECT_EQ(RecordToList(record),
             Lines({"AC:PR", "BG:BEGIN CHAIN LIST", "AC:CH", "FE:EP", "PL:" + Numbers(1000, 1014),
                    "PL:" + Numbers(1015, 1029), "PL:" + Numbers(1030, 1039), "CH:A",
@@ -65,25 +59,19 @@ TEST(SurveyListing, ValuesSurviveBothViews) {
       {"AC:OS", "PD:Iron pin  found here", "FE:IP"},
       // A list ending in "," followed by a new chain record is not continued.
       {"AC:CH", "PL:1,2,3,", "AC:CH", "PL:4,5"},
-      // The last line ends with a list ending in ",".
       {"AC:CH", "PL:1,2,"},
       // Tags that are not two letters, colons inside values.
       {"AC:PR", "NOTE:a", "CP:05/07/2024 9:05:03"},
   };
-  for (const Lines& list : cases) {
-    EXPECT_EQ(RecordToList(ListToRecord(list)), list) << list[1];
-  }
-  EXPECT_EQ(ListToRecord({"AC:CH", "CD:a,b", "PL:" + std::string(70, 'p') + ",1,2"})[0],
-            "AC:CH  CD:a,b");
-}
-
-TEST(SurveyListing, LinesWithoutColonAreDropped) {
+  for (const Lines& list : cases) EXPECT_EQ(RecordToList(ListToRecord(list)), list) << list[1];
+  EXPECT_EQ(ListToRecord(cases[0])[0], "AC:CH  CD:a,b");
+  // Lines without a colon are dropped.
   EXPECT_EQ(ListToRecord({"AC:OS", "no colon here", "PN:1"}), Lines({"AC:OS  PN:1"}));
   EXPECT_EQ(RecordToList({"", "AC:OS  PN:1", "text"}), Lines({"AC:OS", "PN:1"}));
 }
 
 TEST(SurveyListing, FileForms) {
-  TempDir dir;
+  test::TempDir dir;
   std::string error;
   ASSERT_TRUE(ConvertListToRecord(Fixture("listing/control.lst"), dir.file("c.rec"), error));
   ASSERT_TRUE(ConvertRecordToList(dir.file("c.rec"), dir.file("c.lst"), error));

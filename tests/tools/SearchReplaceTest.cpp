@@ -59,20 +59,16 @@ TEST(SearchReplaceFile, InvalidCommandInTheMiddleWritesNothing) {
 
 TEST(SearchReplaceFile, MissingFilesAreReportedInputFirst) {
   TempDir dir;
-  std::string input = dir.file("in.ctl");
-  std::string trn = dir.file("cmd.TRN");
-  std::string out = dir.file("out.ctl");
-  ScriptedUi ui;
-  EXPECT_FALSE(SearchAndReplace(ui, input, out, trn));
-  EXPECT_EQ(ui.onlyText(), "The file '" + input + "' can not be found.");
-  EXPECT_EQ(ui.boxes[0].title, "File Not Found");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-
-  dir.write("in.ctl", "PN:1\r\n");
-  ScriptedUi ui2;
-  EXPECT_FALSE(SearchAndReplace(ui2, input, out, trn));
-  EXPECT_EQ(ui2.onlyText(), "The file '" + trn + "' can not be found.");
-  EXPECT_FALSE(FileExists(out));
+  const std::string input = dir.file("in.ctl"), trn = dir.file("cmd.TRN");
+  for (const std::string& missing : {input, trn}) {
+    ScriptedUi ui;
+    EXPECT_FALSE(SearchAndReplace(ui, input, dir.file("out.ctl"), trn));
+    EXPECT_EQ(ui.onlyText(), "The file '" + missing + "' can not be found.");
+    EXPECT_EQ(ui.boxes[0].title, "File Not Found");
+    EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
+    dir.write("in.ctl", "PN:1\r\n");
+  }
+  EXPECT_FALSE(FileExists(dir.file("out.ctl")));
 }
 
 TEST(SearchReplaceFile, OutputMayReplaceTheInput) {
@@ -146,17 +142,14 @@ TEST(SearchReplaceCommands, ReplacementForms) {
   EXPECT_TRUE(ui.boxes.empty());
 }
 
-TEST(SearchReplaceCommands, LaterCommandsSeeEarlierResults) {
+TEST(SearchReplaceCommands, LaterCommandsSeeEarlierResultsAndEmptyLinesGo) {
   ScriptedUi ui;
   // The replaced entry is one entry: its tag is tested and its whole rest,
   // line break included, compared.
   EXPECT_EQ(Filter(ui, {"FE:A FE:B CM:x", "FE:B FE:C", "CM:x FE:Z"}, {"FE:A", "FE:B"}),
             CrLf({"FE:B", "CM:x", "FE:C"}));
   EXPECT_EQ(Filter(ui, {"PN:1 PN:5", "PN: *10"}, {"PN:1", "PN:2"}), CrLf({"PN:50", "PN:20"}));
-}
-
-TEST(SearchReplaceCommands, EmptyLinesDoNotReachTheOutput) {
-  ScriptedUi ui;
+  // Empty lines do not reach the output.
   EXPECT_EQ(Filter(ui, {"", "PN: +1", ""}, {"", "PN:1", "", "", "XC:5"}), CrLf({"PN:2", "XC:5"}));
 }
 

@@ -4,6 +4,7 @@
 #include <sstream>
 
 #include "geodesy/Angles.h"
+#include "platform/Numbers.h"
 #include "platform/ScriptedUi.h"
 #include "support/TempDir.h"
 #include "userformats/FlexIn.h"
@@ -12,6 +13,7 @@ namespace zv {
 namespace {
 
 using test::CrLf;
+using test::ReadFile;
 using test::TempDir;
 
 FlexInFormat Format(std::string delimiter, std::vector<std::string> columns,
@@ -44,46 +46,66 @@ Read ReadText(ScriptedUi& ui, const FlexInFormat& format, const std::string& tex
   return r;
 }
 
-TEST(FlexInRead, DelimitedFieldsFollowColumnsInFormatOrder) {
-  ScriptedUi ui;
-  // The order cells say nothing for a delimited format: field i is column i.
-  Read r = ReadText(
-      ui,
-      Format("Comma", {"Point ID", "Northing", "Feature Code", "Easting"}, {"4", "3", "2", "1"}),
-      "12, 100.5,,200\n");
-  ASSERT_TRUE(r.ok) << ui.onlyText();
-  ASSERT_EQ(r.points.size(), 1u);
-  EXPECT_EQ(r.points[0].PointName, "12");
-  EXPECT_EQ(r.points[0].Northing, 100.5);
-  EXPECT_EQ(r.points[0].FeatureCode, "");
-  EXPECT_EQ(r.points[0].Easting, 200);
-  EXPECT_EQ(r.points[0].Elevation, kNoValue);
-  EXPECT_EQ(r.points[0].Geometry, "P");
-  EXPECT_EQ(r.points[0].LongitudeHemisphere, "W");
+// The fields of a point that the plane formats fill, "-" for no value.
+std::string Show(const SurveyPoint& p) {
+  auto n = [](double v) { return v == kNoValue ? std::string("-") : FormatPlainDecimal(v); };
+  return p.PointName + "|" + n(p.Northing) + "|" + n(p.Easting) + "|" + n(p.Elevation) + "|" +
+         p.FeatureCode + "|" + p.Geometry + "|" + p.DescriptionLines + "|" + p.ExtraLines + "|" +
+         n(p.Convergence) + "|" + p.LongitudeHemisphere;
 }
 
-TEST(FlexInRead, SpaceRunsAndLiteralDelimiters) {
-  ScriptedUi ui;
-  Read space = ReadText(ui, Format("Space", {"Point ID", "Feature Code", "Geometry"}), "A  5\n");
-  ASSERT_TRUE(space.ok);
-  EXPECT_EQ(space.points[0].PointName, "A");
-  EXPECT_EQ(space.points[0].FeatureCode, "");
-  EXPECT_EQ(space.points[0].Geometry, "5");
-
-  // Any other text is the delimiter itself, also longer than one character
-  // and compared with letter case.
-  Read multi = ReadText(ui, Format("::", {"Point ID", "Northing"}), "P1::10.5\r\n");
-  ASSERT_TRUE(multi.ok);
-  EXPECT_EQ(multi.points[0].PointName, "P1");
-  EXPECT_EQ(multi.points[0].Northing, 10.5);
-  Read named = ReadText(ui, Format("comma", {"Point ID", "Feature Code"}), "1,2comma3\n");
-  ASSERT_TRUE(named.ok);
-  EXPECT_EQ(named.points[0].PointName, "1,2");
-  EXPECT_EQ(named.points[0].FeatureCode, "3");
-  Read tabs = ReadText(ui, Format("Tab", {"Point ID", "Point Description"}), "7\tOAK TREE\n");
-  ASSERT_TRUE(tabs.ok);
-  EXPECT_EQ(tabs.points[0].DescriptionLines, "PD:OAK TREE");
-  EXPECT_TRUE(ui.boxes.empty());
+TEST(FlexInRead, FieldsFollowTheDelimiterAndColumns) {
+  const std::vector<std::string> pnezd = {"Point ID", "Northing", "Easting", "Orthometric Height",
+                                          "Feature Code"};
+  struct Case {
+    FlexInFormat format;
+    std::string text;
+    std::vector<std::string> points;
+  };
+  const std::vector<Case> cases = {
+      // The order cells say nothing for a delimited format: field i is column i.
+      {Format("Comma", {"Point ID", "Northing", "Feature Code", "Easting"}, {"4", "3", "2", "1"}),
+       "12, 100.5,,200\n",
+       {"12|100.5|200|-||P|||-|W"}},
+      // Runs of blanks are one delimiter; other text is the delimiter itself,
+      // also longer than one character and compared with letter case.
+      {Format("Space", {"Point ID", "Feature Code", "Geometry"}), "A  5\n", {"A|-|-|-||5|||-|W"}},
+      {Format("::", {"Point ID", "Northing"}), "P1::10.5\r\n", {"P1|10.5|-|-||P|||-|W"}},
+      {Format("comma", {"Point ID", "Feature Code"}), "1,2comma3\n", {"1,2|-|-|-|3|P|||-|W"}},
+      {Format("Tab", {"Point ID", "Point Description"}),
+       "7\tOAK TREE\n",
+       {"7|-|-|-||P|PD:OAK TREE||-|W"}},
+      // Attributes accumulate; a plane format reads no angles.
+      {Format("Comma", {"Point ID", "Attribute", "Convergance Angle", "Attribute", "Unknown"}),
+       "1,first,0.5,second,whatever\n",
+       {"1|-|-|-||P||CM:first\r\nCM:second|-|W"}},
+      // Trailing delimiters and blank fields lose nothing; a line of blanks
+      // holds no point.
+      {Format("Comma", {"Point ID", "Northing", "Orthometric Height"}),
+       CrLf({"1,10,,,", "2, ,   ", "   "}),
+       {"1|10|-|-||P|||-|W", "2|-|-|-||P|||-|W"}},
+      {Format("Comma", pnezd),
+       ReadFile(ZV_FIXTURES "/flex/comma-trailing-delimiters.csv"),
+       {"1|100.5|200.25|10|IPF|P|||-|W", "2|101.5|201.25|-|CP|P|||-|W"}},
+      // Column-specific fields keep the blanks of text fields; a field may
+      // start beyond the end of its line.
+      {Format(kColumnSpecific, {"Point ID", "Northing", "Feature Code"}, {"1", "11", "25"}),
+       CrLf({"AB        1234.5", "CD        99.25         TREE"}),
+       {"AB        |1234.5|-|-||P|||-|W", "CD        |99.25|-|-|TREE|P|||-|W"}},
+      {Format(kColumnSpecific, pnezd, {"1", "11", "25", "39", "49"}, "PRJ", "#"),
+       ReadFile(ZV_FIXTURES "/flex/fixed-blank-fields.txt"),
+       {"BR-1      |5012.25|7020.5|-|TREE|P|||-|W", "BR-2      |5013|7021.125|812.33||P|||-|W"}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.text);
+    ScriptedUi ui;
+    Read r = ReadText(ui, c.format, c.text);
+    ASSERT_TRUE(r.ok) << ui.onlyText();
+    EXPECT_TRUE(ui.boxes.empty());
+    std::vector<std::string> shown;
+    for (const auto& p : r.points) shown.push_back(Show(p));
+    EXPECT_EQ(shown, c.points);
+  }
 }
 
 TEST(FlexInRead, ProjectHeaderTestComesBeforeIgnore) {
@@ -94,37 +116,15 @@ TEST(FlexInRead, ProjectHeaderTestComesBeforeIgnore) {
   EXPECT_EQ(r.header.HeaderExtraLines, "PRJ job 12\r\nPRJ second");
   ASSERT_EQ(r.points.size(), 2u);
   EXPECT_EQ(r.points[1].PointName, "2");
-
   // Without prefixes every non-empty line is data.
   Read all = ReadText(ui, Format("Comma", {"Point ID"}), CrLf({"PRJ", "#x", "", "P"}));
-  ASSERT_TRUE(all.ok);
   EXPECT_EQ(all.points.size(), 3u);
   EXPECT_EQ(all.header.HeaderExtraLines, "");
-}
-
-TEST(FlexInRead, AttributesAccumulateAndPlaneAnglesStayEmpty) {
-  ScriptedUi ui;
-  Read r = ReadText(
-      ui, Format("Comma", {"Point ID", "Attribute", "Convergance Angle", "Attribute", "Unknown"}),
-      "1,first,0.5,second,whatever\n");
-  ASSERT_TRUE(r.ok);
-  EXPECT_EQ(r.points[0].ExtraLines, "CM:first\r\nCM:second");
-  EXPECT_EQ(r.points[0].Convergence, kNoValue);  // plane units: not an angle format
-}
-
-TEST(FlexInRead, ColumnSpecificKeepsBlanksOfTextFields) {
-  ScriptedUi ui;
-  FlexInFormat f =
-      Format(kColumnSpecific, {"Point ID", "Northing", "Feature Code"}, {"1", "11", "25"});
-  Read r = ReadText(ui, f,
-                    CrLf({"AB        1234.5",
-                          "CD" + std::string(8, ' ') + "99.25" + std::string(9, ' ') + "TREE"}));
-  ASSERT_TRUE(r.ok) << ui.onlyText();
-  EXPECT_EQ(r.points[0].PointName, "AB        ");
-  EXPECT_EQ(r.points[0].Northing, 1234.5);
-  EXPECT_EQ(r.points[0].FeatureCode, "");  // starts beyond the end of the line
-  EXPECT_EQ(r.points[1].Northing, 99.25);
-  EXPECT_EQ(r.points[1].FeatureCode, "TREE");
+  // Neither is the header of the fixed-width fixture.
+  EXPECT_EQ(ReadText(ui, Format(kColumnSpecific, {"Point ID"}, {"1"}, "PRJ", "#"),
+                     ReadFile(ZV_FIXTURES "/flex/fixed-blank-fields.txt"))
+                .header.HeaderExtraLines,
+            "PRJ Bridge 12");
 }
 
 TEST(FlexInRead, GeographicAnglesInEachFormat) {
@@ -203,17 +203,6 @@ TEST(FlexInRead, BadDataLinesNameTheirLine) {
   }
 }
 
-TEST(FlexInRead, EmptyTrailingFieldsAndBlankNumbersAreNoValue) {
-  ScriptedUi ui;
-  // Trailing delimiters and blank fixed-width fields lose nothing.
-  Read r = ReadText(ui, Format("Comma", {"Point ID", "Northing", "Orthometric Height"}),
-                    CrLf({"1,10,,,", "2, ,   ", "   "}));
-  ASSERT_TRUE(r.ok) << ui.onlyText();
-  ASSERT_EQ(r.points.size(), 2u);  // the line of blanks holds no point
-  EXPECT_EQ(r.points[0].Elevation, kNoValue);
-  EXPECT_EQ(r.points[1].Northing, kNoValue);
-}
-
 TEST(FlexInRead, FormatsThatCannotBeReadWith) {
   struct Case {
     FlexInFormat format;
@@ -252,39 +241,6 @@ TEST(FlexInRead, FileWithoutDataLinesIsRefused) {
   EXPECT_EQ(ui.onlyText(),
             "No points were found in 'in.txt'.\r\nEvery line is empty, a project-header line or "
             "an ignored line.");
-}
-
-Read ReadFixture(ScriptedUi& ui, const FlexInFormat& format, const std::string& name) {
-  std::ifstream in(ZV_FIXTURES "/flex/" + name, std::ios::binary);
-  Read r;
-  r.ok = ReadFlexInStream(ui, in, name, format, kMeters, r.header, r.points);
-  return r;
-}
-
-TEST(FlexInRead, Fixtures) {
-  ScriptedUi ui;
-  const std::vector<std::string> pnezd = {"Point ID", "Northing", "Easting", "Orthometric Height",
-                                          "Feature Code"};
-  Read fixed =
-      ReadFixture(ui, Format(kColumnSpecific, pnezd, {"1", "11", "25", "39", "49"}, "PRJ", "#"),
-                  "fixed-blank-fields.txt");
-  ASSERT_TRUE(fixed.ok) << ui.onlyText();
-  EXPECT_EQ(fixed.header.HeaderExtraLines, "PRJ Bridge 12");
-  ASSERT_EQ(fixed.points.size(), 2u);
-  EXPECT_EQ(fixed.points[0].PointName, "BR-1      ");
-  EXPECT_EQ(fixed.points[0].Northing, 5012.25);
-  EXPECT_EQ(fixed.points[0].Elevation, kNoValue);  // blank field
-  EXPECT_EQ(fixed.points[0].FeatureCode, "TREE");
-  EXPECT_EQ(fixed.points[1].Easting, 7021.125);
-  EXPECT_EQ(fixed.points[1].Elevation, 812.33);
-  EXPECT_EQ(fixed.points[1].FeatureCode, "");
-
-  Read comma = ReadFixture(ui, Format("Comma", pnezd), "comma-trailing-delimiters.csv");
-  ASSERT_TRUE(comma.ok) << ui.onlyText();
-  ASSERT_EQ(comma.points.size(), 2u);
-  EXPECT_EQ(comma.points[0].FeatureCode, "IPF");
-  EXPECT_EQ(comma.points[1].Elevation, kNoValue);
-  EXPECT_TRUE(ui.boxes.empty());
 }
 
 class FlexInFile : public ::testing::Test {

@@ -7,6 +7,7 @@
 #include "support/TempDir.h"
 #include "userformats/FlexIn.h"
 #include "userformats/FlexOut.h"
+#include "userformats/FlexStore.h"
 
 namespace zv {
 namespace {
@@ -48,12 +49,7 @@ class FlexOutTest : public ::testing::Test {
     c.horizontalDatum = "NAD 83";
     c.verticalDatum = "NAVD 88";
     std::tm t{};
-    t.tm_year = 2024 - 1900;
-    t.tm_mon = 2;
-    t.tm_mday = 5;
-    t.tm_hour = 7;
-    t.tm_min = 4;
-    t.tm_sec = 9;
+    t.tm_year = 124, t.tm_mon = 2, t.tm_mday = 5, t.tm_hour = 7, t.tm_min = 4, t.tm_sec = 9;
     c.timestamp = t;
     return c;
   }
@@ -246,21 +242,19 @@ TEST(FlexOutShipped, RoundTripThroughTheShippedFormats) {
     WorkArea work;
     FlexInChoices in;
     in.formatName = name;
-    in.horizontalUnits = kUsSurveyFeet;
-    in.verticalUnits = kUsSurveyFeet;
+    in.horizontalUnits = in.verticalUnits = kUsSurveyFeet;
     in.verticalDatum = "NAVD 88";
-    std::string sample = app + "/samples/" +
-                         (name == "PNEZD Comma"   ? "sample-pnezd.csv"
-                          : name == "PNEZD Space" ? "sample-pnezd.txt"
-                                                  : "sample-pnezd-fixed.txt");
+    const std::string sample = app + "/samples/sample-pnezd" +
+                               (name.ends_with("Comma")   ? ".csv"
+                                : name.ends_with("Space") ? ".txt"
+                                                          : "-fixed.txt");
     ASSERT_TRUE(FlexIn(ui, work, app, sample, in)) << name << ": " << ui.onlyText();
     std::vector<SurveyPoint> first = work.InputPoints;
     work.copyInputToOutput();
 
     FlexOutChoices outChoices;
     outChoices.formatName = name;
-    outChoices.horizontalUnits = kUsSurveyFeet;
-    outChoices.verticalUnits = kUsSurveyFeet;
+    outChoices.horizontalUnits = outChoices.verticalUnits = kUsSurveyFeet;
     outChoices.verticalDatum = "NAVD 88";
     std::string written = dir.file("out.txt");
     ASSERT_TRUE(FlexOut(ui, work, app, written, outChoices)) << name << ": " << ui.onlyText();
@@ -274,6 +268,80 @@ TEST(FlexOutShipped, RoundTripThroughTheShippedFormats) {
       EXPECT_EQ(work.InputPoints[i].FeatureCode, first[i].FeatureCode) << name << " " << i;
     }
   }
+}
+
+TEST(FlexStoreTest, ReadsTheWorkedExampleSections) {
+  TempDir dir;
+  dir.write(kFlexInStoreName,
+            CrLf({"[Office CSV]", "Delimiter=Comma", "Coordinate Type=Plane",
+                  "Columns=Point ID,Northing,Easting,Orthometric Height,Feature Code,Attribute",
+                  "Column Order=1,2,3,4,5,6", "Header=", "Ignore=#", "", "[Office Fixed]",
+                  "Delimiter=Column Specific", "Coordinate Type=Plane",
+                  "Columns=Point ID,Northing,Easting,Orthometric Height,Feature Code,Attribute",
+                  "Column Order=1,11,25,39,49,57", "Header=PRJ", "Ignore=#"}));
+  FlexStore store = FlexStore::Input(dir.path());
+  EXPECT_EQ(store.listFormats(), (std::vector<std::string>{"Office CSV", "Office Fixed"}));
+  FlexInFormat f = store.loadInput("office fixed");
+  EXPECT_EQ(f.delimiter, kColumnSpecific);
+  EXPECT_EQ(f.columns.size(), 6u);
+  EXPECT_EQ(f.columns[5], "Attribute");
+  EXPECT_EQ(f.order, (std::vector<std::string>{"1", "11", "25", "39", "49", "57"}));
+  EXPECT_EQ(f.headerPrefix, "PRJ");
+  EXPECT_EQ(f.ignorePrefix, "#");
+  EXPECT_EQ(store.loadInput("Office CSV").headerPrefix, "");
+  EXPECT_EQ(store.readValue("Office CSV", "Header", "none"), "none");  // empty reads as default
+  EXPECT_TRUE(store.hasFormat("OFFICE CSV"));
+  EXPECT_FALSE(store.hasFormat("Office"));
+}
+
+TEST(FlexStoreTest, SaveLoadAndDeleteOutputFormats) {
+  TempDir dir;
+  FlexStore store = FlexStore::Output(dir.path());
+  FlexOutFormat f =
+      Format("Tab", {"Point ID", "Latitude", "Longitude"}, {"1", "2", "3"}, {"", "5", "5"});
+  f.coordinateType = kGeographic;
+  f.writeHeader = true;
+  f.headerPrefix = "#";
+  ASSERT_TRUE(store.save("GNSS", f));
+  FlexOutFormat other = f;
+  other.writeHeader = false;
+  ASSERT_TRUE(store.save("Other", other));
+
+  FlexOutFormat back = store.loadOutput("GNSS");
+  EXPECT_EQ(back.delimiter, "Tab");
+  EXPECT_EQ(back.coordinateType, kGeographic);
+  EXPECT_EQ(back.columns, f.columns);
+  EXPECT_EQ(back.decimalPlaces, f.decimalPlaces);
+  EXPECT_TRUE(back.writeHeader);
+  EXPECT_EQ(back.headerPrefix, "#");
+  EXPECT_FALSE(store.loadOutput("Other").writeHeader);
+  EXPECT_NE(ReadFile(store.path()).find("Decimal Places=,5,5\r\n"), std::string::npos);
+
+  ASSERT_TRUE(store.deleteFormat("gnss"));
+  EXPECT_EQ(store.listFormats(), (std::vector<std::string>{"Other"}));
+
+  // Names that would not read back as the same section are refused.
+  for (std::string bad : {"", " lead", "trail ", "a]b", "two\nlines"}) {
+    EXPECT_FALSE(store.save(bad, f)) << bad;
+  }
+  EXPECT_EQ(store.listFormats(), (std::vector<std::string>{"Other"}));
+}
+
+TEST(FlexStoreTest, WriteHeaderOtherThanOneIsOff) {
+  TempDir dir;
+  dir.write(kFlexOutStoreName, CrLf({"[A]", "Write Header=yes", "[B]", "Write Header=1"}));
+  FlexStore store = FlexStore::Output(dir.path());
+  EXPECT_FALSE(store.loadOutput("A").writeHeader);
+  EXPECT_TRUE(store.loadOutput("B").writeHeader);
+  EXPECT_FALSE(store.loadOutput("missing").writeHeader);
+  EXPECT_TRUE(store.loadOutput("missing").columns.empty());
+  // Column names are spelt as stored, with letter case.
+  EXPECT_EQ(FlexColumnNames(kGeographic)[1], "Latitude");
+  EXPECT_TRUE(FlexColumnFromName("Convergance Angle"));
+  EXPECT_FALSE(FlexColumnFromName("Convergence Angle"));
+  EXPECT_FALSE(FlexColumnFromName("point id"));
+  EXPECT_EQ(ResolveDelimiter("Semicolon"), ";");
+  EXPECT_EQ(ResolveDelimiter("tab"), "tab");
 }
 
 }  // namespace
