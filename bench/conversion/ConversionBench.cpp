@@ -86,7 +86,7 @@ void BM_NadconShiftThroughStandIn(benchmark::State& state) {
   std::mt19937 rng(11);
   std::uniform_real_distribution<double> lat(25, 49), lon(67, 124);
   for (int i = 0; i < kPoints; ++i) {
-    points[i].PointName = "P" + std::to_string(i);
+    points[i].PointName = 'P' + std::to_string(i);
     points[i].Latitude = lat(rng) * zv::kDegreesToRadians;
     points[i].Longitude = lon(rng) * zv::kDegreesToRadians;
   }

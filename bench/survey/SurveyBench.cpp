@@ -46,7 +46,7 @@ void Generate(WorkArea& work, int count) {
     p.FeatureCode = "IP";
     p.ScaleFactor = 0.99991234;
     p.Convergence = 0.0087;
-    p.GRText = "A";
+    p.GRText = std::string(1, 'A');
     p.NorthingError = 0.01f;
     p.EastingError = 0.02f;
     p.ElevationError = 0.03f;

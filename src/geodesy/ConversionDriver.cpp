@@ -16,6 +16,11 @@ namespace zv {
 
 namespace {
 
+// Copied as strings: assigning the literals trips a false -Wrestrict of
+// GCC 12 at -O3.
+const std::string kNorth = "N";
+const std::string kWest = "W";
+
 // A present length in another unit; false when a unit is unknown.
 bool ConvertLength(double& value, const std::string& from, const std::string& to) {
   if (value == kNoValue) return true;
@@ -227,8 +232,8 @@ bool GridToGeographic(Ui& ui, const std::string& appFolder, std::vector<SurveyPo
     GeographicPoint g = Projection_GridToGeographic(prepared, p.Northing, p.Easting);
     p.Latitude = g.phi;
     p.Longitude = g.lambda;
-    p.LatitudeHemisphere = "N";
-    p.LongitudeHemisphere = "W";
+    p.LatitudeHemisphere = kNorth;
+    p.LongitudeHemisphere = kWest;
     p.Convergence = g.convergence;
     p.ScaleFactor = g.scaleFactor;
   }
@@ -249,8 +254,8 @@ bool GeographicToGrid(Ui& ui, const std::string& appFolder, std::vector<SurveyPo
     if (lat == kNoValue || lon == kNoValue) continue;
     p.Latitude = lat;
     p.Longitude = lon;
-    p.LatitudeHemisphere = "N";
-    p.LongitudeHemisphere = "W";
+    p.LatitudeHemisphere = kNorth;
+    p.LongitudeHemisphere = kWest;
     GridPoint g = Projection_GeographicToGrid(prepared, lat, lon);
     p.Northing = g.northing;
     p.Easting = g.easting;

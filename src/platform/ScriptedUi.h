@@ -58,8 +58,11 @@ class ScriptedUi : public Ui {
 
   // The text of the only box shown, or a note that there was not exactly one.
   std::string onlyText() const {
-    if (boxes.size() != 1) return "<" + std::to_string(boxes.size()) + " boxes>";
-    return boxes.front().text;
+    if (boxes.size() == 1) return boxes.front().text;
+    std::string note = "<";
+    note += std::to_string(boxes.size());
+    note += " boxes>";
+    return note;
   }
 
   std::vector<RecordedBox> boxes;

@@ -194,8 +194,11 @@ class WsiWriter {
                   Icon::Exclamation, Buttons::Ok, "Plane Coordiantes Required");
       return false;
     }
-    header.HorizontalUnits = "M";
-    header.VerticalUnits = "M";
+    // Copied from a string: assigning the literal trips a false -Wrestrict of
+    // GCC 12 at -O3.
+    static const std::string kMetres = "M";
+    header.HorizontalUnits = kMetres;
+    header.VerticalUnits = kMetres;
     chooseHeightKind();
     if (!out_.open()) {
       ReportWriteFailure(ui_, path_, out_.error());

@@ -19,7 +19,10 @@ Lines FixtureLines(const std::string& name) {
 
 std::string Numbers(int first, int last) {
   std::string out;
-  for (int i = first; i <= last; ++i) out += (i > first ? "," : "") + std::to_string(i);
+  for (int i = first; i <= last; ++i) {
+    if (i > first) out += ',';
+    out += std::to_string(i);
+  }
   return out;
 }
 

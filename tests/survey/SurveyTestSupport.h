@@ -77,7 +77,7 @@ inline std::string Describe(const WorkArea& work, bool header = true) {
   auto text = [&](std::vector<std::string> keysAndValues) {
     for (size_t i = 0; i < keysAndValues.size(); i += 2) {
       std::string& v = keysAndValues[i + 1];
-      for (size_t at; (at = v.find("\r\n")) != std::string::npos;) v.replace(at, 2, "|");
+      for (size_t at; (at = v.find("\r\n")) != std::string::npos;) v.replace(at, 2, 1, '|');
       if (!v.empty()) s << " " << keysAndValues[i] << "=" << v;
     }
   };
