@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <array>
 #include <filesystem>
 
 #include "app/AppContext.h"
@@ -99,10 +100,7 @@ class DispatcherTest : public CatalogueTest {
 };
 
 TEST_F(DispatcherTest, RefusalsComeInOrderWithTheirMessages) {
-  struct Case {
-    std::string def, in, out, config, text, title;
-  };
-  const std::vector<Case> cases = {
+  const std::array<std::string, 6> cases[] = {
       {"NOPE", input, output, "",
        "The specified translation file '" + dir.file("UTIFiles/NOPE.uti") + "' does not exist.",
        "VORN Zurevazidu"},
@@ -120,12 +118,11 @@ TEST_F(DispatcherTest, RefusalsComeInOrderWithTheirMessages) {
        "Unknown Routine"},
       {"CTL2PRJ", input, dir.file("job.prj"), "", "Can not convert to " + kPrj, "Invalid Format"},
   };
-  for (const Case& c : cases) {
+  for (const auto& [def, in, out, config, text, title] : cases) {
     ui.boxes.clear();
-    EXPECT_FALSE(run(c.def, c.in, c.out, c.config)) << c.text;
-    ASSERT_EQ(ui.onlyText(), c.text);
-    EXPECT_EQ(ui.boxes[0].title, c.title);
-    EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation) << c.text;
+    EXPECT_FALSE(run(def, in, out, config)) << text;
+    ASSERT_EQ(ui.onlyText(), text);
+    EXPECT_TRUE(ui.boxes[0].title == title && ui.boxes[0].icon == Icon::Exclamation) << text;
   }
   ui.boxes.clear();
   EXPECT_FALSE(run("SHORT", input, output));

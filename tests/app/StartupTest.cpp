@@ -76,8 +76,7 @@ TEST_F(RunProgramTest, CommandLineErrorsShowTheirMessages) {
     ui.boxes.clear();
     EXPECT_EQ(run(args), 2) << args;
     ASSERT_EQ(ui.onlyText(), text) << args;
-    EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
-    EXPECT_EQ(ui.boxes[0].title, "VORN Zurevazidu");
+    EXPECT_TRUE(ui.boxes[0].icon == Icon::Information && ui.boxes[0].title == "VORN Zurevazidu");
   }
 }
 
@@ -118,11 +117,9 @@ TEST_F(RunProgramTest, InstanceLockIsPrivateAndKeyedByUserAndFolderOnly) {
 TEST_F(RunProgramTest, PresetsAreHandedToTheWindow) {
   StartupSettings seen;
   EXPECT_EQ(run("-s|True|/in/|/out/|JOB7", [&](AppContext& c) { return seen = c.startup, 0; }), 0);
-  EXPECT_TRUE(seen.viewOutput);
-  EXPECT_EQ(seen.defaultInputFolder, "/in/");
-  EXPECT_EQ(seen.defaultOutputFolder, "/out/");
-  EXPECT_EQ(seen.fileStem, "JOB7");
-  EXPECT_EQ(seen.configurationFolder, dir.path() + "/TRNFiles");
+  EXPECT_EQ(std::to_string(seen.viewOutput) + " " + seen.defaultInputFolder + " " +
+                seen.defaultOutputFolder + " " + seen.fileStem + " " + seen.configurationFolder,
+            "1 /in/ /out/ JOB7 " + dir.path() + "/TRNFiles");
 }
 
 struct Result {
@@ -180,8 +177,7 @@ TEST_F(ExecutableTest, ArgumentsSplitAtBarsAfterJoiningWords) {
   EXPECT_EQ(r.status, 2);
   EXPECT_EQ(r.err, "information: VORN Zurevazidu\nInvalid Command Line Argument.\n\n");
   Result version = run("--version");
-  EXPECT_EQ(version.status, 0);
-  EXPECT_EQ(version.out.rfind("VORN Zurevazidu ", 0), 0u);
+  EXPECT_TRUE(version.status == 0 && version.out.starts_with("VORN Zurevazidu ")) << version.out;
 }
 
 TEST_F(ExecutableTest, BinaryInputIsReportedNotCrashedOn) {
@@ -189,8 +185,8 @@ TEST_F(ExecutableTest, BinaryInputIsReportedNotCrashedOn) {
   for (int i = 0; i < 70000; ++i) junk += static_cast<char>((i * 7919) % 256);
   work.write("junk.ctl", junk);
   Result r = toPac("junk.ctl", "junk.pac");
-  EXPECT_EQ(r.status, 1);
-  EXPECT_EQ(r.err.rfind("exclamation: Invalid VORN Control File\n", 0), 0u) << r.err;
+  EXPECT_TRUE(r.status == 1 && r.err.starts_with("exclamation: Invalid VORN Control File\n"))
+      << r.err;
   EXPECT_FALSE(fs::exists(work.file("junk.pac")));
 }
 

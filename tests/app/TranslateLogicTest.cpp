@@ -24,6 +24,14 @@ const std::string kControl =
     CrLf({"AC:PR", "AC:OS", "PN:CP1", "YC:1000.0", "XC:2000.0", "ZC:300.5", "FE:TREE", "AC:OS",
           "PN:CP2", "YC:1100.25", "XC:2050.75", "ZC:301.0", "FE:POLE"});
 
+// The boxes shown, "icon title: text" one a line, icons by their first letter.
+std::string Boxes(const ScriptedUi& ui) {
+  std::string all;
+  for (const auto& b : ui.boxes)
+    all += std::string(1, " IECQ"[int(b.icon)]) + " " + b.title + ": " + b.text + "\n";
+  return all;
+}
+
 class TranslateLogicTest : public ::testing::Test {
  protected:
   TranslateLogicTest() : ctx(ui, dir.path()), logic(ctx) {
@@ -56,6 +64,26 @@ class TranslateLogicTest : public ::testing::Test {
     if (!to.empty()) logic.output.text = dir.file(to);
   }
 
+  // "inputs / outputs / actions / enabled boxes configuration", types by
+  // their extension and the selected entries starred.
+  std::string state() const {
+    auto list = [](const ChoiceList& l) {
+      std::string all;
+      for (int i = 0; i < int(l.items.size()); ++i) {
+        const std::string& item = l.items[i];
+        const size_t ext = item.find("(*.");
+        all += std::string(i ? "," : "") + (i == l.selected ? "*" : "") +
+               (ext == std::string::npos ? item : item.substr(ext + 3, 3));
+      }
+      return all;
+    };
+    return list(logic.inputTypes) + " / " + list(logic.outputTypes) + " / " + list(logic.actions) +
+           " /" + (logic.input.enabled ? " in" : "") + (logic.output.enabled ? " out" : "") +
+           (logic.configuration.enabled ? " config" : "") +
+           (logic.configuration.text.empty() ? "" : " " + logic.configuration.text) +
+           (logic.storeDefault ? " default" : "");
+  }
+
   test::TempDir dir;
   ScriptedUi ui;
   AppContext ctx;
@@ -76,41 +104,24 @@ TEST(ChoiceListTest, FillDropsEmptyAndRepeatedEntriesAndConsoleGoesBelow) {
 TEST_F(TranslateLogicTest, ListsCascadeFromTheCatalogue) {
   ASSERT_TRUE(logic.load());
   EXPECT_TRUE(ui.boxes.empty());
-  EXPECT_EQ(logic.inputTypes.items, (std::vector<std::string>{kCtl, kPac, kManualEntryType}));
+  const std::string manual = kManualEntryType;
   // Filling a list selects its first entry, which fills the list below.
-  EXPECT_EQ(logic.inputTypes.current(), kCtl);
-  EXPECT_EQ(logic.outputTypes.items, (std::vector<std::string>{kPac, kPrj, kCtl}));
-  EXPECT_EQ(logic.outputTypes.current(), kPac);
-  EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"To PAC"}));
-  EXPECT_TRUE(logic.input.enabled);
-  EXPECT_TRUE(logic.output.enabled);
-  EXPECT_FALSE(logic.configuration.enabled);
-
+  EXPECT_EQ(state(), "*CTL,PAC," + manual + " / *PAC,PRJ,CTL / *To PAC / in out");
   logic.selectOutputType(logic.outputTypes.find(kCtl));
-  EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"Filter", "Copy"}));
-  EXPECT_EQ(logic.actions.current(), "Filter");
   // A bare configuration name is found in TRNFiles.
-  EXPECT_TRUE(logic.configuration.enabled);
-  EXPECT_EQ(logic.configuration.text, dir.file("TRNFiles/CODES.TRN"));
-  EXPECT_TRUE(logic.storeDefault);
-
+  EXPECT_EQ(state(), "*CTL,PAC," + manual + " / PAC,PRJ,*CTL / *Filter,Copy / in out config " +
+                         dir.file("TRNFiles/CODES.TRN") + " default");
   logic.selectAction(logic.actions.find("Copy"));
-  EXPECT_FALSE(logic.configuration.enabled);
-  EXPECT_EQ(logic.configuration.text, "");
-  EXPECT_FALSE(logic.storeDefault);
-
+  EXPECT_EQ(state(), "*CTL,PAC," + manual + " / PAC,PRJ,*CTL / Filter,*Copy / in out");
   // Another input type starts the cascade again and resets the configuration.
   logic.selectAction(logic.actions.find("Filter"));
   logic.selectInputType(logic.inputTypes.find(kPac));
-  EXPECT_EQ(logic.outputTypes.items, (std::vector<std::string>{kCtl, kPac}));
-  EXPECT_EQ(logic.actions.items, (std::vector<std::string>{"To CTL", "Batch"}));
-  EXPECT_FALSE(logic.configuration.enabled);
-  EXPECT_FALSE(logic.storeDefault);
+  EXPECT_EQ(state(), "CTL,*PAC," + manual + " / *CTL,PAC / *To CTL,Batch / in out");
 
   // Manual entry has no locations and skips the file checks; its routine is
   // not one the window runs.
   logic.selectInputType(logic.inputTypes.find(kManualEntryType));
-  EXPECT_FALSE(logic.input.enabled || logic.output.enabled);
+  EXPECT_EQ(state(), "CTL,PAC,*" + manual + " / *" + manual + " / *One point /");
   EXPECT_EQ(logic.input.text + logic.output.text, "");
   EXPECT_FALSE(logic.translate());
   EXPECT_EQ(ui.onlyText(), "Could not perform translation.");
@@ -156,10 +167,9 @@ TEST_F(TranslateLogicTest, ChecksComeInOrderEachWithItsMessage) {
     ui.boxes.clear();
     mend();
     EXPECT_FALSE(logic.translate());
-    ASSERT_EQ(ui.onlyText(), message);
-    EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-    EXPECT_EQ(ui.boxes[0].title, message.starts_with("The input and output") ? "Incompatible Files"
-                                                                             : "VORN Zurevazidu");
+    EXPECT_EQ(Boxes(ui), (message.starts_with("The input and output") ? "E Incompatible Files: "
+                                                                      : "E VORN Zurevazidu: ") +
+                             message + "\n");
   }
   EXPECT_FALSE(std::filesystem::exists(output));
 }
@@ -188,9 +198,7 @@ TEST_F(TranslateLogicTest, ConvertFileRunsAndReportsCompletion) {
   ASSERT_TRUE(logic.translate()) << ui.onlyText();
   EXPECT_EQ(longRuns, 1);
   EXPECT_FALSE(ctx.work.ConversionOptionsActive);
-  ASSERT_EQ(ui.onlyText(), "Conversion Complete.");
-  EXPECT_EQ(ui.boxes[0].title, "Conversion Complete");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_EQ(Boxes(ui), "I Conversion Complete: Conversion Complete.\n");
   EXPECT_NE(ReadFile(dir.file("out/job.pac")).find("PN:CP2\r\n"), std::string::npos);
   EXPECT_TRUE(ui.editors.empty());
 
@@ -207,26 +215,18 @@ TEST_F(TranslateLogicTest, RunFailuresNameTheirCause) {
   ASSERT_TRUE(logic.load());
   choose(kCtl, kPrj, "To PRJ", input, "out/job.prj");
   EXPECT_FALSE(logic.translate());
-  EXPECT_EQ(ui.onlyText(), "Can not convert to " + kPrj);
-  EXPECT_EQ(ui.boxes[0].title, "Invalid Format");
   EXPECT_FALSE(std::filesystem::exists(dir.file("out/job.prj")));
-
-  ui.boxes.clear();
   choose(kPac, kCtl, "Batch", input, "out/job.CTL");
   EXPECT_FALSE(logic.translate());
-  EXPECT_EQ(ui.onlyText(), "Could not perform translation.");
-}
-
-TEST_F(TranslateLogicTest, ErrorsRaisedDuringARunAreShownWithTheirSource) {
-  ASSERT_TRUE(logic.load());
-  logic.input.text = input;
-  logic.output.text = dir.file("out/job.pac");
+  // Errors raised during a run are shown with their source.
+  choose(kCtl, kPac, "To PAC", input, "out/job.pac");
   logic.setLongRunner([](const std::function<bool()>&) -> bool {
     throw ZvError(13, "Type mismatch", "modAngles.Angles_PackedToRadians");
   });
   EXPECT_FALSE(logic.translate());
-  ASSERT_EQ(ui.onlyText(), "Type mismatch");
-  EXPECT_EQ(ui.boxes[0].title, "modAngles.Angles_PackedToRadians");
+  EXPECT_EQ(Boxes(ui), "E Invalid Format: Can not convert to " + kPrj +
+                           "\nE VORN Zurevazidu: Could not perform translation.\n"
+                           "E modAngles.Angles_PackedToRadians: Type mismatch\n");
 }
 
 TEST_F(TranslateLogicTest, ReplaceChecksItsConfigurationAndStoresTheDefault) {
@@ -291,14 +291,14 @@ TEST_F(TranslateLogicTest, BrowseAndEditButtons) {
   EXPECT_EQ(logic.output.text, dir.file("out/"));
   logic.selectInputType(logic.inputTypes.find("User-Defined ASCII Files (*.*)"));
   logic.browseInput();
-  ASSERT_EQ(ui.fileDialogs.size(), 3u);
-  EXPECT_EQ(ui.fileDialogs[0].title, "Select the Input File:");
-  EXPECT_EQ(ui.fileDialogs[0].filter, kCtl + "|*.CTL");
-  EXPECT_EQ(ui.fileDialogs[0].folder, dir.file("data/"));
-  EXPECT_EQ(ui.fileDialogs[1].title, "Output to File:");
-  EXPECT_EQ(ui.fileDialogs[1].kind, FileDialogKind::Save);
-  EXPECT_EQ(ui.fileDialogs[1].filter, kPac + "|*.PAC");
-  EXPECT_EQ(ui.fileDialogs[2].filter, "User-Defined ASCII Files (*.*)|*.*");
+  std::string dialogs;
+  for (const auto& d : ui.fileDialogs)
+    dialogs += d.title + (d.kind == FileDialogKind::Save ? " (save) " : " ") + d.filter + " " +
+               d.folder + "\n";
+  EXPECT_EQ(dialogs, "Select the Input File: " + kCtl + "|*.CTL " + dir.file("data/") +
+                         "\nOutput to File: (save) " + kPac + "|*.PAC " + dir.file("out/") +
+                         "\nSelect the Input File: User-Defined ASCII Files (*.*)|*.* " +
+                         dir.file("data/") + "\n");
 
   // Configuration files open in the editor.
   logic.configuration.text = dir.file("TRNFiles/NONE.TRN");
@@ -335,11 +335,11 @@ TEST_F(TranslateLogicTest, ConsoleCannotBrowseOrEditButCanView) {
 TEST_F(TranslateLogicTest, NoDefinitionsLeaveTheListsEmpty) {
   std::filesystem::remove_all(dir.file("UTIFiles"));
   EXPECT_FALSE(logic.load());
-  ASSERT_EQ(ui.onlyText(), "No valid translations were found!");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Critical);
   EXPECT_TRUE(logic.inputTypes.items.empty());
   EXPECT_FALSE(logic.translate());
-  EXPECT_EQ(ui.boxes.back().text, "You must select an input type");
+  EXPECT_EQ(Boxes(ui),
+            "C VORN Zurevazidu: No valid translations were found!\n"
+            "E VORN Zurevazidu: You must select an input type\n");
   EXPECT_EQ(TranslateLogic::Caption(), "VORN Zurevazidu - " + std::to_string(kVersionMajor) + "." +
                                            std::to_string(kVersionMinor) + "." +
                                            std::to_string(kVersionRevision));

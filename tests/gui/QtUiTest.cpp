@@ -16,7 +16,7 @@
 namespace zv {
 namespace {
 
-TEST(QtUiTest, NameFiltersMatchEitherLetterCase) {
+TEST(QtUiTest, NameFiltersMatchEitherLetterCaseAndUiKindFollowsTheDisplay) {
   EXPECT_EQ(QtNameFilters("VORN Control Files (*.CTL)|*.CTL"),
             QStringList{"VORN Control Files (*.CTL *.ctl)"});
   EXPECT_EQ(QtNameFilters("Translation/Filter Files (*.TRN)|*.trn"),
@@ -26,9 +26,7 @@ TEST(QtUiTest, NameFiltersMatchEitherLetterCase) {
   EXPECT_EQ(QtNameFilters("Available Point Numbers|"), QStringList{"Available Point Numbers (*)"});
   EXPECT_EQ(FilterSuffix("VORN Control Files (*.CTL *.ctl)"), "CTL");
   EXPECT_EQ(FilterSuffix("User-Defined ASCII Files (*)"), "");
-}
-
-TEST(QtUiTest, UnattendedRunsUseQtOnlyWithADisplay) {
+  // Unattended runs use Qt only with a display.
   using M = StartMode;
   EXPECT_EQ(ChooseUi(M::Unattended, "", true, ""), UiKind::Qt);
   EXPECT_EQ(ChooseUi(M::Unattended, "", false, "offscreen"), UiKind::Console);
@@ -39,24 +37,18 @@ TEST(QtUiTest, UnattendedRunsUseQtOnlyWithADisplay) {
   EXPECT_EQ(ChooseUi(M::WrongCount, "", false, "offscreen"), UiKind::Console);
 }
 
-// Answers the next message box once it is up, recording what it showed.
-struct BoxAnswer {
-  QString title, text;
-  QMessageBox::Icon icon = QMessageBox::NoIcon;
-  QMessageBox::StandardButtons buttons;
-  bool onGuiThread = false;
-};
-
-void AnswerNextBox(BoxAnswer& seen, QMessageBox::StandardButton press) {
+// Answers the next message box once it is up, noting "title|text|icon|buttons"
+// and whether the GUI thread shows it.
+void AnswerNextBox(QString& seen, QMessageBox::StandardButton press) {
   auto* timer = new QTimer(qApp);
   QObject::connect(timer, &QTimer::timeout, timer, [timer, &seen, press] {
     auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
     if (!box) return;
-    seen.title = box->windowTitle();
-    seen.text = box->text();
-    seen.icon = box->icon();
-    seen.buttons = box->standardButtons();
-    seen.onGuiThread = box->thread() == qApp->thread();
+    seen = QString("%1|%2|%3|%4|%5")
+               .arg(box->windowTitle(), box->text())
+               .arg(box->icon())
+               .arg(box->standardButtons().toInt())
+               .arg(box->thread() == qApp->thread() ? "gui" : "worker");
     box->button(press)->click();
     timer->deleteLater();
   });
@@ -65,25 +57,23 @@ void AnswerNextBox(BoxAnswer& seen, QMessageBox::StandardButton press) {
 
 TEST(QtUiTest, BoxesAskedForByAWorkerAreShownByTheGuiThread) {
   QtUi ui;
-  BoxAnswer seen;
+  QString seen;
   AnswerNextBox(seen, QMessageBox::No);
   Answer answer = Answer::Ok;
-  const bool result = RunInBackground(nullptr, "Working", [&] {
+  EXPECT_TRUE(RunInBackground(nullptr, "Working", [&] {
     answer = ui.message("Overwrite it?\r\nReally?", Icon::None, Buttons::YesNo, "");
     return true;
-  });
-  EXPECT_TRUE(result);
+  }));
   EXPECT_EQ(answer, Answer::No);
-  EXPECT_EQ(seen.title, "VORN Zurevazidu");
-  EXPECT_EQ(seen.text, "Overwrite it?\nReally?");
-  EXPECT_EQ(seen.icon, QMessageBox::NoIcon);
-  EXPECT_EQ(seen.buttons, QMessageBox::Yes | QMessageBox::No);
-  EXPECT_TRUE(seen.onGuiThread);
-
+  const int yesNo = (QMessageBox::Yes | QMessageBox::No).toInt();
+  EXPECT_EQ(seen, QString("VORN Zurevazidu|Overwrite it?\nReally?|%1|%2|gui")
+                      .arg(QMessageBox::NoIcon)
+                      .arg(yesNo));
   AnswerNextBox(seen, QMessageBox::Ok);
   ui.exclaim("Can not convert to X", "Invalid Format");
-  EXPECT_EQ(seen.title, "Invalid Format");
-  EXPECT_EQ(seen.icon, QMessageBox::Warning);
+  EXPECT_EQ(seen, QString("Invalid Format|Can not convert to X|%1|%2|gui")
+                      .arg(QMessageBox::Warning)
+                      .arg(QMessageBox::Ok));
 }
 
 // A long run keeps the event loop turning and shows that it is working.
@@ -98,12 +88,11 @@ TEST(QtUiTest, LongWorkKeepsTheWindowsAliveAndShowsProgress) {
   });
   ticker.start(25);
   QThread* worker = nullptr;
-  const bool result = RunInBackground(nullptr, "Translating...", [&] {
+  EXPECT_FALSE(RunInBackground(nullptr, "Translating...", [&] {
     worker = QThread::currentThread();
     std::this_thread::sleep_for(std::chrono::milliseconds(900));
     return false;
-  });
-  EXPECT_FALSE(result);
+  }));
   EXPECT_NE(worker, qApp->thread());
   EXPECT_GT(ticks, 10);
   EXPECT_TRUE(progressShown);

@@ -32,6 +32,12 @@ FlexInFormat Format(std::string delimiter, std::vector<std::string> columns,
   return f;
 }
 
+FlexInFormat Geo(std::vector<std::string> columns, std::string delimiter = "Comma") {
+  FlexInFormat f = Format(std::move(delimiter), std::move(columns));
+  f.coordinateType = kGeographic;
+  return f;
+}
+
 struct Read {
   bool ok = false;
   FileHeader header;
@@ -112,10 +118,8 @@ TEST(FlexInRead, ProjectHeaderTestComesBeforeIgnore) {
   ScriptedUi ui;
   FlexInFormat f = Format("Comma", {"Point ID", "Northing"}, {}, "PRJ", "P");
   Read r = ReadText(ui, f, CrLf({"PRJ job 12", "PT,skipped", "", "1,10", "PRJ second", "2,20"}));
-  ASSERT_TRUE(r.ok);
-  EXPECT_EQ(r.header.HeaderExtraLines, "PRJ job 12\r\nPRJ second");
-  ASSERT_EQ(r.points.size(), 2u);
-  EXPECT_EQ(r.points[1].PointName, "2");
+  ASSERT_TRUE(r.ok && r.points.size() == 2);
+  EXPECT_EQ(r.header.HeaderExtraLines + "|" + r.points[1].PointName, "PRJ job 12\r\nPRJ second|2");
   // Without prefixes every non-empty line is data.
   Read all = ReadText(ui, Format("Comma", {"Point ID"}), CrLf({"PRJ", "#x", "", "P"}));
   EXPECT_EQ(all.points.size(), 3u);
@@ -129,118 +133,82 @@ TEST(FlexInRead, ProjectHeaderTestComesBeforeIgnore) {
 
 TEST(FlexInRead, GeographicAnglesInEachFormat) {
   const double expected = (45 + 30 / 60.0 + 15.25 / 3600) * kDegreesToRadians;
-  struct Case {
-    const char* format;
-    const char* text;
-  };
-  for (Case c :
-       {Case{kFormatDMS, "45 30 15.25"}, Case{kFormatPacked, "45.301525"},
-        Case{kFormatDecimal, " 45.5042361111111 "}, Case{kFormatDM, "45 30.2541666666667"}}) {
+  for (auto [format, text] :
+       {std::pair{kFormatDMS, "45 30 15.25"}, std::pair{kFormatPacked, "45.301525"},
+        std::pair{kFormatDecimal, " 45.5042361111111 "},
+        std::pair{kFormatDM, "45 30.2541666666667"}}) {
     ScriptedUi ui;
-    FlexInFormat f = Format(",", {"Point ID", "Latitude", "Longitude", "Convergance Angle"});
-    f.coordinateType = kGeographic;
-    Read r = ReadText(ui, f, std::string("1,") + c.text + "," + c.text + ",\n", c.format);
-    ASSERT_TRUE(r.ok) << c.format << ": " << ui.onlyText();
-    EXPECT_NEAR(r.points[0].Latitude, expected, 1e-14) << c.format;
-    EXPECT_NEAR(r.points[0].Longitude, expected, 1e-14) << c.format;
+    FlexInFormat f = Geo({"Point ID", "Latitude", "Longitude", "Convergance Angle"}, ",");
+    Read r = ReadText(ui, f, std::string("1,") + text + "," + text + ",\n", format);
+    ASSERT_TRUE(r.ok) << format << ": " << ui.onlyText();
+    EXPECT_NEAR(r.points[0].Latitude, expected, 1e-14) << format;
+    EXPECT_NEAR(r.points[0].Longitude, expected, 1e-14) << format;
     EXPECT_EQ(r.points[0].Convergence, kNoValue);  // empty field
   }
 }
 
 TEST(FlexInRead, AngleOutOfRangeIsReportedWithItsLineAndReadingGoesOn) {
   ScriptedUi ui;
-  FlexInFormat f = Format("Comma", {"Point ID", "Latitude"});
-  f.coordinateType = kGeographic;
-  Read r = ReadText(ui, f, CrLf({"1,45 61 00", "2,45 30 00"}), kFormatDMS);
-  ASSERT_TRUE(r.ok);
-  ASSERT_EQ(r.points.size(), 2u);
+  Read r =
+      ReadText(ui, Geo({"Point ID", "Latitude"}), CrLf({"1,45 61 00", "2,45 30 00"}), kFormatDMS);
+  ASSERT_TRUE(r.ok && r.points.size() == 2);
   EXPECT_EQ(r.points[0].Latitude, kNoValue);
   EXPECT_NEAR(r.points[1].Latitude, 45.5 * kDegreesToRadians, 1e-14);
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].title, "Invalid Angle");
-  EXPECT_EQ(ui.boxes[0].text,
+  EXPECT_EQ(ui.onlyText(),
             "Invalid Angle '45 61 00'. Minutes portion must be positive and not exceed 59."
             "\r\nError on line 1.");
+  EXPECT_EQ(ui.boxes[0].title, "Invalid Angle");
 }
 
-// Bad data lines stop the read with one message that names the line
-// (counted over all lines of the file) and nothing is returned.
-TEST(FlexInRead, BadDataLinesNameTheirLine) {
-  const std::string head = "Invalid User-Defined ASCII File 'in.txt'.\r\nError on line 3.\r\n";
-  struct Case {
-    FlexInFormat format;
-    std::string angleFormat;
-    std::string line3;
-    std::string message;
-  };
-  FlexInFormat geo = Format("Comma", {"Point ID", "Longitude"});
-  geo.coordinateType = kGeographic;
-  std::vector<Case> cases = {
-      {Format("Comma", {"Point ID", "Northing"}), kMeters, "7,12,5",
-       "The line has 3 fields but the format has 2 columns."},
-      {Format("Comma", {"Point ID", "Northing"}), kMeters, "7,12a",
-       "The Northing '12a' is not a number."},
-      {Format("Comma", {"Point ID", "Scale Factor"}), kMeters, "7,1e999",
-       "The Scale Factor '1e999' is not a number."},
-      {Format("Comma", {"Point ID", "Height Error Estimate"}), kMeters, "7,1e60",
-       "The Height Error Estimate '1e60' is out of range."},
-      {geo, kFormatPacked, "7,W45.30",
-       "The Longitude 'W45.30' is not an angle in the "
-       "DDD.MMSSssss format."},
-      {geo, kFormatDMS, "7,45 30 x",
-       "The Longitude '45 30 x' is not an angle in the "
-       "DDD MM SS.ssss format."},
-  };
-  for (const auto& c : cases) {
-    ScriptedUi ui;
-    Read r = ReadText(ui, c.format, CrLf({"1", "", c.line3, "9"}), c.angleFormat);
-    EXPECT_FALSE(r.ok) << c.line3;
-    EXPECT_TRUE(r.points.empty());
-    ASSERT_EQ(ui.boxes.size(), 1u) << c.line3;
-    EXPECT_EQ(ui.boxes[0].title, "Invalid User-Defined ASCII File");
-    EXPECT_EQ(ui.boxes[0].text, head + c.message) << c.line3;
-    EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-  }
-}
-
-TEST(FlexInRead, FormatsThatCannotBeReadWith) {
-  struct Case {
-    FlexInFormat format;
-    std::string title;
-    std::string text;
-  };
-  std::vector<Case> cases = {
-      {Format("", {"Point ID"}), "Delimiter Required", "A Delimiter is required."},
-      {Format("Comma", {}), "Specify Columns", "You must specify at least one column to import."},
-      {Format(kColumnSpecific, {"Point ID", "Northing"}, {"1"}), "Specify Column",
+// Refusals come as one message and return nothing. Bad data lines name their
+// line, counted over all lines of the file.
+TEST(FlexInRead, RefusalsNameTheirCause) {
+  const std::string bad = "Invalid User-Defined ASCII File";
+  const std::string at3 = bad + " 'in.txt'.\r\nError on line 3.\r\n";
+  const std::string position = "Invalid Column Position";
+  auto line3 = [](const std::string& line) { return CrLf({"1", "", line, "9"}); };
+  const std::tuple<FlexInFormat, std::string, std::string, std::string, std::string> cases[] = {
+      {Format("Comma", {"Point ID", "Northing"}), kMeters, line3("7,12,5"), bad,
+       at3 + "The line has 3 fields but the format has 2 columns."},
+      {Format("Comma", {"Point ID", "Northing"}), kMeters, line3("7,12a"), bad,
+       at3 + "The Northing '12a' is not a number."},
+      {Format("Comma", {"Point ID", "Scale Factor"}), kMeters, line3("7,1e999"), bad,
+       at3 + "The Scale Factor '1e999' is not a number."},
+      {Format("Comma", {"Point ID", "Height Error Estimate"}), kMeters, line3("7,1e60"), bad,
+       at3 + "The Height Error Estimate '1e60' is out of range."},
+      {Geo({"Point ID", "Longitude"}), kFormatPacked, line3("7,W45.30"), bad,
+       at3 + "The Longitude 'W45.30' is not an angle in the DDD.MMSSssss format."},
+      {Geo({"Point ID", "Longitude"}), kFormatDMS, line3("7,45 30 x"), bad,
+       at3 + "The Longitude '45 30 x' is not an angle in the DDD MM SS.ssss format."},
+      {Format("", {"Point ID"}), kMeters, "1,2\n", "Delimiter Required",
+       "A Delimiter is required."},
+      {Format("Comma", {}), kMeters, "1,2\n", "Specify Columns",
+       "You must specify at least one column to import."},
+      {Format(kColumnSpecific, {"Point ID", "Northing"}, {"1"}), kMeters, "1,2\n", "Specify Column",
        "You must specify the column for 'Northing'."},
-      {Format(kColumnSpecific, {"Point ID", "Northing"}, {"1", "1.5"}), "Invalid Column Position",
+      {Format(kColumnSpecific, {"Point ID", "Northing"}, {"1", "1.5"}), kMeters, "1,2\n", position,
        "The position '1.5' of the column 'Northing' is not a whole number from 1 to 32767."},
-      {Format(kColumnSpecific, {"Point ID", "Northing"}, {"0", "5"}), "Invalid Column Position",
+      {Format(kColumnSpecific, {"Point ID", "Northing"}, {"0", "5"}), kMeters, "1,2\n", position,
        "The position '0' of the column 'Point ID' is not a whole number from 1 to 32767."},
-      {Format(kColumnSpecific, {"Point ID", "Northing", "Easting"}, {"1", "12", "12"}),
-       "Invalid Column Position",
+      {Format(kColumnSpecific, {"Point ID", "Northing", "Easting"}, {"1", "12", "12"}), kMeters,
+       "1,2\n", position,
        "The column positions must be ascending: 'Easting' at position 12 does not start after "
        "'Northing' at position 12."},
+      {Format("Comma", {"Point ID"}, {}, "PRJ", "#"), kMeters,
+       "PRJ only a header\r\n# a comment\r\n\r\n", "No Points Found",
+       "No points were found in 'in.txt'.\r\nEvery line is empty, a project-header line or "
+       "an ignored line."},
   };
-  for (const auto& c : cases) {
+  for (const auto& [format, angles, text, title, message] : cases) {
+    SCOPED_TRACE(message);
     ScriptedUi ui;
-    Read r = ReadText(ui, c.format, "1,2\n");
-    EXPECT_FALSE(r.ok) << c.text;
-    ASSERT_EQ(ui.boxes.size(), 1u) << c.text;
-    EXPECT_EQ(ui.boxes[0].title, c.title);
-    EXPECT_EQ(ui.boxes[0].text, c.text);
+    Read r = ReadText(ui, format, text, angles);
+    EXPECT_FALSE(r.ok);
+    EXPECT_TRUE(r.points.empty());
+    EXPECT_EQ(ui.onlyText(), message);
+    EXPECT_EQ(ui.boxes.at(0).title, title);
+    EXPECT_EQ(ui.boxes.at(0).icon, Icon::Exclamation);
   }
-}
-
-TEST(FlexInRead, FileWithoutDataLinesIsRefused) {
-  ScriptedUi ui;
-  Read r = ReadText(ui, Format("Comma", {"Point ID"}, {}, "PRJ", "#"),
-                    CrLf({"PRJ only a header", "# and a comment", ""}));
-  EXPECT_FALSE(r.ok);
-  EXPECT_EQ(ui.onlyText(),
-            "No points were found in 'in.txt'.\r\nEvery line is empty, a project-header line or "
-            "an ignored line.");
 }
 
 class FlexInFile : public ::testing::Test {
@@ -271,27 +239,21 @@ TEST_F(FlexInFile, SuccessFillsHeaderAndStampsUnitsOnPoints) {
                             "PRJ"))));
   EXPECT_TRUE(ui.boxes.empty());
   const FileHeader& h = work.InputHeader;
-  EXPECT_EQ(h.HeaderExtraLines, "PRJ Main St");
-  EXPECT_EQ(h.ProjectLine, "");
-  EXPECT_EQ(h.CoordinateSystem, "State Plane 1983");
-  EXPECT_EQ(h.Zone, "Wisconsin Central");
-  EXPECT_EQ(h.HorizontalDatum, "NAD 83");
-  EXPECT_EQ(h.HorizontalUnits, kUsSurveyFeet);
-  EXPECT_EQ(h.VerticalDatum, "NAVD 88");
-  EXPECT_EQ(h.VerticalUnits, kMeters);
-  ASSERT_EQ(work.InputPoints.size(), 1u);
+  EXPECT_EQ(h.HeaderExtraLines + "|" + h.ProjectLine + "|" + h.CoordinateSystem + "|" + h.Zone +
+                "|" + h.HorizontalDatum + "|" + h.HorizontalUnits + "|" + h.VerticalDatum + "|" +
+                h.VerticalUnits,
+            std::string("PRJ Main St||State Plane 1983|Wisconsin Central|NAD 83|") + kUsSurveyFeet +
+                "|NAVD 88|" + kMeters);
   // Without the units a writer would convert from "" and lose every value.
-  EXPECT_EQ(work.InputPoints[0].HorizontalUnits, kUsSurveyFeet);
-  EXPECT_EQ(work.InputPoints[0].VerticalUnits, kMeters);
-  EXPECT_EQ(work.InputPoints[0].LongitudeHemisphere, "W");
+  const SurveyPoint& p = work.InputPoints.at(0);
+  EXPECT_EQ(p.HorizontalUnits + "|" + p.VerticalUnits + "|" + p.LongitudeHemisphere,
+            std::string(kUsSurveyFeet) + "|" + kMeters + "|W");
   EXPECT_EQ(work.InputChains.size(), 2u);  // chains are not the reader's
 }
 
 TEST_F(FlexInFile, GeographicPointsTakeTheChosenDirections) {
   std::string path = dir.write("geo.txt", "1;43.0415;89.2412\n");
-  FlexInFormat f = Format("Semicolon", {"Point ID", "Latitude", "Longitude"});
-  f.coordinateType = kGeographic;
-  FlexInChoices c = Choices(f);
+  FlexInChoices c = Choices(Geo({"Point ID", "Latitude", "Longitude"}, "Semicolon"));
   c.coordinateSystem = kGeographicCoordinates;
   c.horizontalUnits = kFormatPacked;
   c.latitudeDirection = "S";
@@ -327,50 +289,12 @@ TEST_F(FlexInFile, StoredFormatIsUsedWhenNoneIsGiven) {
   c.format.reset();
   c.formatName = "office fixed";  // section names ignore letter case
   ASSERT_TRUE(FlexIn(ui, work, dir.path(), path, c)) << ui.onlyText();
-  EXPECT_EQ(work.InputPoints.at(0).PointName, "P-1     ");
-  EXPECT_EQ(work.InputPoints.at(0).Northing, 5000.125);
+  EXPECT_EQ(Show(work.InputPoints.at(0)), "P-1     |5000.125|-|-||P|||-|W");
 
   c.formatName = "Gone";
   EXPECT_FALSE(FlexIn(ui, work, dir.path(), path, c));
-  EXPECT_EQ(ui.boxes.back().title, "Format Not Found");
-  EXPECT_EQ(ui.boxes.back().text, "The format 'Gone' can not be found in '" + store.path() + "'.");
-}
-
-// The formats shipped in the application folder read their samples.
-TEST(FlexInShipped, SamplesReadWithTheirFormats) {
-  const std::string app = ZV_SOURCE_DIR "/appdata";
-  struct Case {
-    const char* format;
-    const char* sample;
-    size_t points;
-  };
-  for (Case c :
-       {Case{"PNEZD Comma", "sample-pnezd.csv", 12}, Case{"PNEZD Space", "sample-pnezd.txt", 12},
-        Case{"PNEZD Fixed", "sample-pnezd-fixed.txt", 12},
-        Case{"Geographic PLLHD", "sample-geographic.csv", 6}}) {
-    ScriptedUi ui;
-    WorkArea work;
-    FlexInChoices choices;
-    choices.formatName = c.format;
-    bool geographic = std::string(c.format).starts_with("Geographic");
-    choices.horizontalUnits = geographic ? kFormatDMS : kUsSurveyFeet;
-    choices.verticalUnits = kUsSurveyFeet;
-    ASSERT_TRUE(FlexIn(ui, work, app, app + "/samples/" + c.sample, choices))
-        << c.format << ": " << ui.onlyText();
-    EXPECT_TRUE(ui.boxes.empty()) << c.format;
-    ASSERT_EQ(work.InputPoints.size(), c.points) << c.format;
-    for (const auto& p : work.InputPoints) {
-      EXPECT_FALSE(p.PointName.empty()) << c.format;
-      if (geographic) {
-        EXPECT_GT(p.Latitude, 0.7) << c.format << " " << p.PointName;
-        EXPECT_GT(p.Longitude, 1.5) << c.format << " " << p.PointName;
-      } else {
-        EXPECT_GT(p.Northing, 1000) << c.format << " " << p.PointName;
-        EXPECT_GT(p.Easting, 1000) << c.format << " " << p.PointName;
-      }
-      EXPECT_FALSE(p.FeatureCode.empty()) << c.format;
-    }
-  }
+  EXPECT_EQ(ui.boxes.back().title + ": " + ui.boxes.back().text,
+            "Format Not Found: The format 'Gone' can not be found in '" + store.path() + "'.");
 }
 
 }  // namespace

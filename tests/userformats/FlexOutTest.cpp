@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
 
+#include <sstream>
+
 #include "Version.h"
 #include "geodesy/Angles.h"
 #include "platform/ScriptedUi.h"
@@ -36,6 +38,12 @@ SurveyPoint Point(std::string name, double northing, std::string units = kMeters
   return p;
 }
 
+std::string Join(const std::vector<std::string>& items) {
+  std::string all;
+  for (size_t i = 0; i < items.size(); ++i) all += (i ? "," : "") + items[i];
+  return all;
+}
+
 class FlexOutTest : public ::testing::Test {
  protected:
   FlexOutChoices Choices(FlexOutFormat format) {
@@ -64,24 +72,47 @@ class FlexOutTest : public ::testing::Test {
   WorkArea work;
 };
 
-TEST_F(FlexOutTest, DelimitedColumnsAreSortedByOrder) {
-  work.OutputPoints = {Point("7", 10.25)};
-  EXPECT_EQ(Write(Choices(Format("Comma", {"Point ID", "Northing"}, {"2", "1"}, {"", "3"}))),
-            CrLf({"10.250,7"}));
-  // Equal numbers keep the grid order; a literal delimiter of two characters.
-  work.OutputPoints = {Point("7", 10.25)};
-  EXPECT_EQ(Write(Choices(Format(" | ", {"Northing", "Point ID", "Geometry"}, {"2", "1", "2"}))),
-            CrLf({"7 | 10 | P"}));
-  EXPECT_TRUE(ui.boxes.empty());
-}
-
-TEST_F(FlexOutTest, NumberFormatting) {
-  work.OutputPoints = {Point("a", 0.5), Point("b", -12.34), Point("c", 1234.5),
-                       Point("d", kNoValue), Point("e", 0.04)};
-  FlexOutFormat f =
-      Format("Comma", {"Northing", "Northing", "Northing"}, {"1", "2", "3"}, {"2", "1", ""});
-  EXPECT_EQ(Write(Choices(f)), CrLf({"0.50,0.5,0", "-12.34,-12.3,-12", "1234.50,1234.5,1234",
-                                     "-99999.00,-99999.0,-99999", "0.04,0.0,0"}));
+// Columns sorted by order (equal numbers keep the grid order), number
+// formats, text columns on one line, fixed positions padded and cut; the
+// warnings come after a complete write.
+TEST_F(FlexOutTest, WrittenLinesAndWarnings) {
+  SurveyPoint tree = Point("1", 5);
+  tree.DescriptionLines = "PD:OAK\r\nPD:24 IN";
+  tree.ExtraLines = "CM:a";
+  tree.FeatureCode = "OAK TREE";
+  const std::string cut =
+      "1 field(s) were cut short by the next column's position (first on "
+      "line 1, column 'Point ID').";
+  const std::string split =
+      "1 field(s) contain the delimiter and will not read back as one "
+      "field (first on line 2, column 'Feature Code').";
+  auto expect = [&](std::vector<SurveyPoint> points, const FlexOutFormat& format,
+                    const std::vector<std::string>& lines, const std::string& warning) {
+    SCOPED_TRACE(lines[0]);
+    work.OutputPoints = std::move(points);
+    ui.boxes.clear();
+    EXPECT_EQ(Write(Choices(format)), CrLf(lines));
+    EXPECT_EQ(ui.boxes.empty() ? "" : ui.onlyText(),
+              warning.empty() ? "" : "The file '" + out + "' was written, but:\r\n" + warning);
+    for (const auto& box : ui.boxes) EXPECT_EQ(box.title, "Check Output File");
+  };
+  expect({Point("7", 10.25)}, Format("Comma", {"Point ID", "Northing"}, {"2", "1"}, {"", "3"}),
+         {"10.250,7"}, "");
+  expect({Point("7", 10.25)}, Format(" | ", {"Northing", "Point ID", "Geometry"}, {"2", "1", "2"}),
+         {"7 | 10 | P"}, "");
+  expect({Point("a", 0.5), Point("b", -12.34), Point("c", 1234.5), Point("d", kNoValue),
+          Point("e", 0.04)},
+         Format("Comma", {"Northing", "Northing", "Northing"}, {"1", "2", "3"}, {"2", "1", ""}),
+         {"0.50,0.5,0", "-12.34,-12.3,-12", "1234.50,1234.5,1234", "-99999.00,-99999.0,-99999",
+          "0.04,0.0,0"},
+         "");
+  expect({tree}, Format(";", {"Point Description", "Attribute", "Feature Code"}, {"1", "2", "3"}),
+         {"PD:OAK  PD:24 IN;CM:a;OAK TREE"}, "");
+  expect({Point("ABCDEFGH", 12.5), Point("AB", 3)},
+         Format(kColumnSpecific, {"Northing", "Point ID"}, {"6", "1"}, {"1", ""}),
+         {"ABCDE12.5", "AB   3.0"}, cut);
+  expect({Point("0", 1), tree}, Format("Space", {"Point ID", "Feature Code"}, {"1", "2"}),
+         {"0 ", "1 OAK TREE"}, split);
 }
 
 TEST_F(FlexOutTest, UnitsAndHemispheresAreConvertedOnceAndStoredBack) {
@@ -100,7 +131,7 @@ TEST_F(FlexOutTest, UnitsAndHemispheresAreConvertedOnceAndStoredBack) {
   c.verticalUnits = kInternationalFeet;
   // The second Northing column must not convert the converted value again.
   EXPECT_EQ(Write(c), CrLf({"3280.8333,6561.6667,328.084,0.0328,0.99996000,3280.8333"}));
-  EXPECT_NEAR(work.OutputPoints[0].Northing, 3280.833333333, 1e-6);
+  EXPECT_NEAR(work.OutputPoints[0].Northing, 3280.833333333, 1e-6);  // stored back
   EXPECT_NEAR(work.OutputPoints[0].Elevation, 328.0839895, 1e-9);
 }
 
@@ -158,48 +189,8 @@ TEST_F(FlexOutTest, HeaderBlock) {
   EXPECT_EQ(Write(Choices(f)), CrLf({"1"}));
 }
 
-TEST_F(FlexOutTest, TextColumnsKeepTheirTagsOnOneLine) {
-  SurveyPoint p = Point("1", 5);
-  p.DescriptionLines = "PD:OAK\r\nPD:24 IN";
-  p.ExtraLines = "CM:a";
-  p.FeatureCode = "TREE";
-  work.OutputPoints = {p};
-  EXPECT_EQ(Write(Choices(
-                Format(";", {"Point Description", "Attribute", "Feature Code"}, {"1", "2", "3"}))),
-            CrLf({"PD:OAK  PD:24 IN;CM:a;TREE"}));
-  EXPECT_TRUE(ui.boxes.empty());
-}
-
-TEST_F(FlexOutTest, FixedPositionsPadAndCutWithAWarning) {
-  work.OutputPoints = {Point("ABCDEFGH", 12.5), Point("AB", 3)};
-  FlexOutFormat f = Format(kColumnSpecific, {"Northing", "Point ID"}, {"6", "1"}, {"1", ""});
-  EXPECT_EQ(Write(Choices(f)), CrLf({"ABCDE12.5", "AB   3.0"}));
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].title, "Check Output File");
-  EXPECT_EQ(ui.boxes[0].text, "The file '" + out +
-                                  "' was written, but:\r\n1 field(s) were cut short by the next "
-                                  "column's position (first on line 1, column 'Point ID').");
-}
-
-TEST_F(FlexOutTest, FieldsHoldingTheDelimiterAreReported) {
-  SurveyPoint p = Point("1", 5);
-  p.FeatureCode = "OAK TREE";
-  work.OutputPoints = {Point("0", 1), p};
-  EXPECT_EQ(Write(Choices(Format("Space", {"Point ID", "Feature Code"}, {"1", "2"}))),
-            CrLf({"0 ", "1 OAK TREE"}));
-  EXPECT_EQ(ui.onlyText(), "The file '" + out +
-                               "' was written, but:\r\n1 field(s) contain the delimiter and will "
-                               "not read back as one field (first on line 2, column 'Feature "
-                               "Code').");
-}
-
 TEST_F(FlexOutTest, RefusalsWriteNothing) {
-  struct Case {
-    FlexOutFormat format;
-    std::string title;
-    std::string text;
-  };
-  std::vector<Case> cases = {
+  const std::tuple<FlexOutFormat, std::string, std::string> cases[] = {
       {Format("", {"Point ID"}, {"1"}), "Delimiter Required", "A Delimiter is required."},
       {Format("Comma", {}, {}), "Specify Columns",
        "You must specify at least one column to import."},
@@ -211,62 +202,65 @@ TEST_F(FlexOutTest, RefusalsWriteNothing) {
        "The decimal places '16' of the column 'Northing' are not a whole number from 0 to 15."},
   };
   work.OutputPoints = {Point("1", 5)};
-  for (const auto& c : cases) {
+  for (const auto& [format, title, text] : cases) {
     ScriptedUi ui2;
-    EXPECT_FALSE(FlexOut(ui2, work, dir.path(), out, Choices(c.format)));
-    ASSERT_EQ(ui2.boxes.size(), 1u) << c.text;
-    EXPECT_EQ(ui2.boxes[0].title, c.title);
-    EXPECT_EQ(ui2.boxes[0].text, c.text);
+    EXPECT_FALSE(FlexOut(ui2, work, dir.path(), out, Choices(format)));
+    EXPECT_EQ(ui2.onlyText(), text);
+    EXPECT_EQ(ui2.boxes.at(0).title, title);
   }
+  std::string bad = dir.file("no-such-folder/out.txt");
+  EXPECT_FALSE(FlexOut(ui, work, dir.path(), bad, Choices(Format("Comma", {"Point ID"}, {"1"}))));
+  EXPECT_NE(ui.onlyText().find(bad), std::string::npos);
+  ui.boxes.clear();
   work.OutputPoints.clear();
   EXPECT_FALSE(FlexOut(ui, work, dir.path(), out, Choices(Format("Comma", {"Point ID"}, {"1"}))));
   EXPECT_EQ(ui.onlyText(), "There are no points to write. The file '" + out + "' was not written.");
   EXPECT_FALSE(FileExists(out));
 }
 
-TEST_F(FlexOutTest, UnwritableOutputIsReported) {
-  work.OutputPoints = {Point("1", 5)};
-  std::string bad = dir.file("no-such-folder/out.txt");
-  EXPECT_FALSE(FlexOut(ui, work, dir.path(), bad, Choices(Format("Comma", {"Point ID"}, {"1"}))));
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_NE(ui.boxes[0].text.find(bad), std::string::npos);
-}
-
-// Shipped input and output formats of the same name read back what they
-// wrote.
-TEST(FlexOutShipped, RoundTripThroughTheShippedFormats) {
+// The shipped input formats read their samples, and the output formats of the
+// same name write what reads back alike.
+TEST(FlexShipped, SamplesReadAndRoundTrip) {
   const std::string app = ZV_SOURCE_DIR "/appdata";
-  for (std::string name : {"PNEZD Comma", "PNEZD Space", "PNEZD Fixed"}) {
+  auto shown = [](const std::vector<SurveyPoint>& points) {
+    std::ostringstream all;
+    all.precision(12);
+    for (const auto& p : points) {
+      all << p.PointName << "," << p.Northing << "," << p.Easting << "," << p.Elevation << ","
+          << p.Latitude << "," << p.Longitude << "," << p.FeatureCode << "\n";
+      EXPECT_FALSE(p.PointName.empty() || p.FeatureCode.empty());
+      EXPECT_TRUE((p.Northing > 1000 && p.Easting > 1000) ||
+                  (p.Latitude > 0.7 && p.Longitude > 1.5));
+    }
+    return all.str();
+  };
+  for (auto [name, sample, count] : {std::tuple{"PNEZD Comma", "sample-pnezd.csv", 12u},
+                                     {"PNEZD Space", "sample-pnezd.txt", 12u},
+                                     {"PNEZD Fixed", "sample-pnezd-fixed.txt", 12u},
+                                     {"Geographic PLLHD", "sample-geographic.csv", 6u}}) {
+    SCOPED_TRACE(name);
     ScriptedUi ui;
     TempDir dir;
     WorkArea work;
+    const bool geographic = std::string(name).starts_with("Geographic");
     FlexInChoices in;
     in.formatName = name;
-    in.horizontalUnits = in.verticalUnits = kUsSurveyFeet;
+    in.horizontalUnits = geographic ? kFormatDMS : kUsSurveyFeet;
+    in.verticalUnits = kUsSurveyFeet;
     in.verticalDatum = "NAVD 88";
-    const std::string sample = app + "/samples/sample-pnezd" +
-                               (name.ends_with("Comma")   ? ".csv"
-                                : name.ends_with("Space") ? ".txt"
-                                                          : "-fixed.txt");
-    ASSERT_TRUE(FlexIn(ui, work, app, sample, in)) << name << ": " << ui.onlyText();
-    std::vector<SurveyPoint> first = work.InputPoints;
+    ASSERT_TRUE(FlexIn(ui, work, app, app + "/samples/" + sample, in)) << ui.onlyText();
+    ASSERT_EQ(work.InputPoints.size(), count);
+    const std::string first = shown(work.InputPoints);
     work.copyInputToOutput();
-
-    FlexOutChoices outChoices;
-    outChoices.formatName = name;
-    outChoices.horizontalUnits = outChoices.verticalUnits = kUsSurveyFeet;
-    outChoices.verticalDatum = "NAVD 88";
-    std::string written = dir.file("out.txt");
-    ASSERT_TRUE(FlexOut(ui, work, app, written, outChoices)) << name << ": " << ui.onlyText();
-    ASSERT_TRUE(FlexIn(ui, work, app, written, in)) << name << ": " << ui.onlyText();
-    EXPECT_TRUE(ui.boxes.empty()) << name << ": " << ui.boxes.size();
-    ASSERT_EQ(work.InputPoints.size(), first.size()) << name;
-    for (size_t i = 0; i < first.size(); ++i) {
-      EXPECT_EQ(work.InputPoints[i].Northing, first[i].Northing) << name << " " << i;
-      EXPECT_EQ(work.InputPoints[i].Easting, first[i].Easting) << name << " " << i;
-      EXPECT_EQ(work.InputPoints[i].Elevation, first[i].Elevation) << name << " " << i;
-      EXPECT_EQ(work.InputPoints[i].FeatureCode, first[i].FeatureCode) << name << " " << i;
-    }
+    FlexOutChoices out;
+    out.formatName = name;
+    out.horizontalUnits = in.horizontalUnits;
+    out.verticalUnits = kUsSurveyFeet;
+    out.verticalDatum = "NAVD 88";
+    ASSERT_TRUE(FlexOut(ui, work, app, dir.file("out.txt"), out)) << ui.onlyText();
+    ASSERT_TRUE(FlexIn(ui, work, app, dir.file("out.txt"), in)) << ui.onlyText();
+    EXPECT_TRUE(ui.boxes.empty()) << ui.boxes.size();
+    EXPECT_EQ(shown(work.InputPoints), first);
   }
 }
 
@@ -282,12 +276,11 @@ TEST(FlexStoreTest, ReadsTheWorkedExampleSections) {
   FlexStore store = FlexStore::Input(dir.path());
   EXPECT_EQ(store.listFormats(), (std::vector<std::string>{"Office CSV", "Office Fixed"}));
   FlexInFormat f = store.loadInput("office fixed");
-  EXPECT_EQ(f.delimiter, kColumnSpecific);
-  EXPECT_EQ(f.columns.size(), 6u);
-  EXPECT_EQ(f.columns[5], "Attribute");
-  EXPECT_EQ(f.order, (std::vector<std::string>{"1", "11", "25", "39", "49", "57"}));
-  EXPECT_EQ(f.headerPrefix, "PRJ");
-  EXPECT_EQ(f.ignorePrefix, "#");
+  EXPECT_EQ(f.delimiter + "|" + Join(f.columns) + "|" + Join(f.order) + "|" + f.headerPrefix + "|" +
+                f.ignorePrefix,
+            std::string(kColumnSpecific) +
+                "|Point ID,Northing,Easting,Orthometric Height,Feature Code,Attribute|"
+                "1,11,25,39,49,57|PRJ|#");
   EXPECT_EQ(store.loadInput("Office CSV").headerPrefix, "");
   EXPECT_EQ(store.readValue("Office CSV", "Header", "none"), "none");  // empty reads as default
   EXPECT_TRUE(store.hasFormat("OFFICE CSV"));
@@ -307,14 +300,11 @@ TEST(FlexStoreTest, SaveLoadAndDeleteOutputFormats) {
   other.writeHeader = false;
   ASSERT_TRUE(store.save("Other", other));
 
-  FlexOutFormat back = store.loadOutput("GNSS");
-  EXPECT_EQ(back.delimiter, "Tab");
-  EXPECT_EQ(back.coordinateType, kGeographic);
-  EXPECT_EQ(back.columns, f.columns);
-  EXPECT_EQ(back.decimalPlaces, f.decimalPlaces);
-  EXPECT_TRUE(back.writeHeader);
-  EXPECT_EQ(back.headerPrefix, "#");
-  EXPECT_FALSE(store.loadOutput("Other").writeHeader);
+  FlexOutFormat b = store.loadOutput("GNSS");
+  EXPECT_EQ(b.delimiter + "|" + b.coordinateType + "|" + Join(b.columns) + "|" + Join(b.order) +
+                "|" + Join(b.decimalPlaces) + "|" + std::to_string(b.writeHeader) + "|" +
+                b.headerPrefix + "|" + std::to_string(store.loadOutput("Other").writeHeader),
+            "Tab|" + std::string(kGeographic) + "|Point ID,Latitude,Longitude|1,2,3|,5,5|1|#|0");
   EXPECT_NE(ReadFile(store.path()).find("Decimal Places=,5,5\r\n"), std::string::npos);
 
   ASSERT_TRUE(store.deleteFormat("gnss"));
@@ -331,15 +321,15 @@ TEST(FlexStoreTest, WriteHeaderOtherThanOneIsOff) {
   TempDir dir;
   dir.write(kFlexOutStoreName, CrLf({"[A]", "Write Header=yes", "[B]", "Write Header=1"}));
   FlexStore store = FlexStore::Output(dir.path());
-  EXPECT_FALSE(store.loadOutput("A").writeHeader);
-  EXPECT_TRUE(store.loadOutput("B").writeHeader);
-  EXPECT_FALSE(store.loadOutput("missing").writeHeader);
-  EXPECT_TRUE(store.loadOutput("missing").columns.empty());
+  const FlexOutFormat missing = store.loadOutput("missing");
+  EXPECT_EQ(std::to_string(store.loadOutput("A").writeHeader) +
+                std::to_string(store.loadOutput("B").writeHeader) +
+                std::to_string(missing.writeHeader) + Join(missing.columns),
+            "010");
   // Column names are spelt as stored, with letter case.
   EXPECT_EQ(FlexColumnNames(kGeographic)[1], "Latitude");
   EXPECT_TRUE(FlexColumnFromName("Convergance Angle"));
-  EXPECT_FALSE(FlexColumnFromName("Convergence Angle"));
-  EXPECT_FALSE(FlexColumnFromName("point id"));
+  EXPECT_FALSE(FlexColumnFromName("Convergence Angle") || FlexColumnFromName("point id"));
   EXPECT_EQ(ResolveDelimiter("Semicolon"), ";");
   EXPECT_EQ(ResolveDelimiter("tab"), "tab");
 }
