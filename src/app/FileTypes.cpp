@@ -1,7 +1,6 @@
 #include "app/FileTypes.h"
 
 #include "app/AppContext.h"
-#include "platform/TextIo.h"
 #include "survey/NgsDataSheet.h"
 #include "survey/SrvFile.h"
 #include "survey/SurveyFiles.h"
@@ -16,17 +15,6 @@ bool Adapt(AppContext& ctx, const std::string& path) {
   return Fn(ctx.ui, ctx.work, path);
 }
 
-// The readers take UTF-8 or ANSI text; UTF-16 is refused by name before
-// its NUL bytes are taken for binary data.
-template <bool (*Fn)(Ui&, WorkArea&, const std::string&)>
-bool AdaptReader(AppContext& ctx, const std::string& path) {
-  if (IsUtf16File(path)) {
-    ctx.ui.exclaim(Utf16Refusal(path), kUtf16Title);
-    return false;
-  }
-  return Fn(ctx.ui, ctx.work, path);
-}
-
 // User-defined files are read and written through the flex dialogs.
 bool NeedsFlexDialog(AppContext& ctx, const std::string&) {
   ctx.ui.exclaim(
@@ -36,19 +24,17 @@ bool NeedsFlexDialog(AppContext& ctx, const std::string&) {
 }
 
 constexpr FileType kTypes[] = {
-    {"NGS Data Sheets (*.DS)", AdaptReader<ReadNgsDataSheet>, nullptr, nullptr},
-    {"VORN Control Files (*.CTL)", AdaptReader<ReadControlFile>, Adapt<WriteControlFile>,
+    {"NGS Data Sheets (*.DS)", Adapt<ReadNgsDataSheet>, nullptr, nullptr},
+    {"VORN Control Files (*.CTL)", Adapt<ReadControlFile>, Adapt<WriteControlFile>,
      Adapt<WriteControlFile>},
-    {"VORN Project Files (*.PRJ)", AdaptReader<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
-    {"VORN Edited Project Files (*.EDI)", AdaptReader<ReadProjectFile>, nullptr,
-     Adapt<WriteProjectFile>},
-    {"VORN Calculated Files (*.CAL)", AdaptReader<ReadProjectFile>, nullptr,
-     Adapt<WriteProjectFile>},
-    {"VORN Points and Chains Files (*.PAC)", AdaptReader<ReadPointsChainsFile>,
+    {"VORN Project Files (*.PRJ)", Adapt<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
+    {"VORN Edited Project Files (*.EDI)", Adapt<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
+    {"VORN Calculated Files (*.CAL)", Adapt<ReadProjectFile>, nullptr, Adapt<WriteProjectFile>},
+    {"VORN Points and Chains Files (*.PAC)", Adapt<ReadPointsChainsFile>,
      Adapt<WritePointsChainsFile>, Adapt<WritePointsChainsFile>},
-    {"Wisconsin Summary Index Files (*.WSI)", AdaptReader<ReadWsiFile>, Adapt<WriteWsiFile>,
+    {"Wisconsin Summary Index Files (*.WSI)", Adapt<ReadWsiFile>, Adapt<WriteWsiFile>,
      Adapt<WriteWsiFile>},
-    {"CAiCE SRV Files (*.SRV)", AdaptReader<ReadSrvFile>, Adapt<WriteSrvFile>, Adapt<WriteSrvFile>},
+    {"CAiCE SRV Files (*.SRV)", Adapt<ReadSrvFile>, Adapt<WriteSrvFile>, Adapt<WriteSrvFile>},
     {kUserDefinedType, NeedsFlexDialog, NeedsFlexDialog, nullptr},
 };
 

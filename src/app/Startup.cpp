@@ -9,8 +9,6 @@
 #include <algorithm>
 #include <cctype>
 #include <cerrno>
-#include <cinttypes>
-#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <functional>
@@ -69,15 +67,6 @@ std::string ArgumentText(int argc, char** argv) {
 
 namespace {
 
-// FNV-1a: the same name for the same folder in every run.
-std::string FolderKey(const std::string& folder) {
-  uint64_t h = 14695981039346656037ull;
-  for (unsigned char c : folder) h = (h ^ c) * 1099511628211ull;
-  char key[17];
-  std::snprintf(key, sizeof key, "%016" PRIx64, h);
-  return key;
-}
-
 // Opens folder as a private folder of the user: created with mode 0700 when
 // missing; refused when it is a link or belongs to someone else. Returns
 // the descriptor of the folder, or -1.
@@ -114,7 +103,8 @@ InstanceLock::InstanceLock(const std::string& appFolder) {
   std::error_code ec;
   std::string canonical = std::filesystem::weakly_canonical(appFolder, ec).string();
   if (ec) canonical = appFolder;
-  name_ = "instance-" + FolderKey(canonical) + ".lock";
+  // The same name for the same folder in every run.
+  name_ = "instance-" + StableHashHex(canonical) + ".lock";
   folder_ = OpenLockFolder();
   // Without a lock file the guard cannot work; the program still runs.
   if (folder_ < 0) return;

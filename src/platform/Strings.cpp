@@ -1,5 +1,9 @@
 #include "platform/Strings.h"
 
+#include <cinttypes>
+#include <cstdint>
+#include <cstdio>
+
 namespace zv {
 
 namespace {
@@ -37,6 +41,14 @@ bool EqualsNoCase(std::string_view a, std::string_view b) {
   for (size_t i = 0; i < a.size(); ++i)
     if (Lower(a[i]) != Lower(b[i])) return false;
   return true;
+}
+
+std::string StableHashHex(std::string_view s) {
+  uint64_t h = 14695981039346656037ull;
+  for (unsigned char c : s) h = (h ^ c) * 1099511628211ull;
+  char hex[17];
+  std::snprintf(hex, sizeof hex, "%016" PRIx64, h);
+  return hex;
 }
 
 }  // namespace zv

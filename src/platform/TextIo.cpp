@@ -8,7 +8,6 @@
 #include <algorithm>
 #include <atomic>
 #include <cerrno>
-#include <cinttypes>
 #include <climits>
 #include <cstring>
 #include <filesystem>
@@ -16,6 +15,8 @@
 #include <iterator>
 #include <mutex>
 #include <sstream>
+
+#include "platform/Strings.h"
 
 namespace zv {
 
@@ -187,20 +188,11 @@ void UnregisterTemp(int& slot) {
   slot = -1;
 }
 
-// FNV-1a: a hash that stays the same from run to run.
-uint64_t StableHash(std::string_view text) {
-  uint64_t h = 14695981039346656037ull;
-  for (unsigned char c : text) h = (h ^ c) * 1099511628211ull;
-  return h;
-}
-
 // Temporary files are named ".zv-<hash of the file name>-<pid>-<n>.tmp":
 // short whatever the length of the file name, and recognisable as those of
 // one output file and one process.
 std::string TempPrefix(const std::string& fileName) {
-  char prefix[32];
-  std::snprintf(prefix, sizeof prefix, ".zv-%016" PRIx64 "-", StableHash(fileName));
-  return prefix;
+  return ".zv-" + StableHashHex(fileName) + "-";
 }
 
 // Seconds since the epoch at which process pid started; 0 when unknown.

@@ -8,6 +8,7 @@
 #include "platform/Error.h"
 #include "platform/Strings.h"
 #include "platform/TextIo.h"
+#include "survey/SurveyIo.h"
 
 namespace zv {
 
@@ -294,6 +295,7 @@ bool ReadNgsDataSheet(Ui& ui, WorkArea& work, const std::string& path) {
                kInvalidTitle);
     return false;
   }
+  if (RefuseUtf16(ui, path)) return false;
   return ReadNgsDataSheetStream(ui, work, in, path);
 }
 

@@ -18,6 +18,12 @@ void ReportReadFailure(Ui& ui, const std::string& path, const std::string& reaso
              Icon::Exclamation, Buttons::Ok, "File Not Read");
 }
 
+bool RefuseUtf16(Ui& ui, const std::string& path) {
+  if (!IsUtf16File(path)) return false;
+  ui.exclaim(Utf16Refusal(path), kUtf16Title);
+  return true;
+}
+
 bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in) {
   if (!FileExists(path)) {
     ui.message("The file '" + path + "' can not be found.", Icon::Exclamation, Buttons::Ok,
@@ -29,7 +35,7 @@ bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in) {
     ReportReadFailure(ui, path, std::strerror(errno));
     return false;
   }
-  return true;
+  return !RefuseUtf16(ui, path);
 }
 
 void ReportWriteFailure(Ui& ui, const std::string& path, const std::string& reason) {

@@ -12,8 +12,12 @@
 
 namespace zv {
 
+// The readers take UTF-8 or ANSI text: a UTF-16 file is refused by name
+// (before its NUL bytes are taken for binary data). True when refused.
+bool RefuseUtf16(Ui& ui, const std::string& path);
+
 // Opens an input file; a missing file shows "File Not Found", one that cannot
-// be opened "File Not Read". False after either message.
+// be opened "File Not Read", a UTF-16 one is refused. False after the message.
 bool OpenSurveyInput(Ui& ui, const std::string& path, std::ifstream& in);
 
 // The message a reader shows when its input cannot be read.
