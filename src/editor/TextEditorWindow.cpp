@@ -441,4 +441,19 @@ void TextEditorWindow::updateStatus() {
   columnLabel_->setText("Column Number: " + QString::number(c.positionInBlock() + 1));
 }
 
+QWidget* OpenTextEditor(Ui& ui, const std::string& path, const std::string& type,
+                        EditorMode mode) {
+  auto* editor = new TextEditorWindow(ui);
+  editor->setAttribute(Qt::WA_DeleteOnClose);
+  // Shown first: a long file then fills a visible window behind its progress.
+  editor->show();
+  if (path.empty() && mode == EditorMode::Editor) {
+    editor->showNew(QString::fromStdString(type));
+  } else {
+    editor->showTextEditor(QString::fromStdString(path), QString::fromStdString(type),
+                           mode == EditorMode::Viewer);
+  }
+  return editor;
+}
+
 }  // namespace zv

@@ -17,6 +17,7 @@ namespace zv {
 
 class FindReplaceDialog;
 class Ui;
+enum class EditorMode;
 
 class TextEditorWindow : public QMainWindow {
   Q_OBJECT
@@ -92,5 +93,10 @@ QString EditorFilter(const QString& typeText);
 // True when the View menu applies: the path ends in PRJ, EDI, CAL, PAC, CTL
 // or ALI (letter case as written).
 bool HasListingViews(const QString& path);
+
+// A new editor window on the file (a new text when the path is empty in the
+// editing mode), shown at once and deleted when closed.
+QWidget* OpenTextEditor(Ui& ui, const std::string& path, const std::string& typeDescription,
+                        EditorMode mode);
 
 }  // namespace zv

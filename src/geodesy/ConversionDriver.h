@@ -15,8 +15,6 @@
 
 namespace zv {
 
-inline constexpr const char* kGeographicCoordinates = "Geographic Coordinates";
-
 // What the Coordinate Conversion window fills. For a geographic side the
 // horizontal units hold an angle format name.
 struct ConversionSettings {

@@ -64,7 +64,7 @@ class NgsReader {
       return false;
     }
     points_.push_back(std::move(point_));
-    header_.CoordinateSystem = "Geographic Coordinates";
+    header_.CoordinateSystem = kGeographicCoordinates;
     header_.HorizontalUnits = kFormatDMS;
     header_.VerticalUnits = kMeters;
     work.InputHeader = std::move(header_);

@@ -341,7 +341,7 @@ class SrvWriter {
 
   bool write() {
     FileHeader& header = work_.OutputHeader;
-    if (header.CoordinateSystem == "Geographic Coordinates") {
+    if (header.CoordinateSystem == kGeographicCoordinates) {
       ui_.message("A Caice SRV File must contain plane coordinates.", Icon::Exclamation,
                   Buttons::Ok, "Plane Coordiantes Required");
       return false;

@@ -11,6 +11,10 @@
 
 namespace zv {
 
+// The coordinate system of latitudes and longitudes, beside the grid systems
+// of the zone catalog.
+inline constexpr const char* kGeographicCoordinates = "Geographic Coordinates";
+
 struct SurveyPoint {
   std::string PointName;
   std::string Text2;  // not used by the survey formats; carried through

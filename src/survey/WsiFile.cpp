@@ -189,7 +189,7 @@ class WsiWriter {
 
   bool write() {
     FileHeader& header = work_.OutputHeader;
-    if (header.CoordinateSystem == "Geographic Coordinates") {
+    if (header.CoordinateSystem == kGeographicCoordinates) {
       ui_.message("A Wisconsin Summary Index File must contain plane coordinates.",
                   Icon::Exclamation, Buttons::Ok, "Plane Coordiantes Required");
       return false;

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "platform/Ui.h"
+#include "survey/SurveyModel.h"
 
 namespace zv {
 
@@ -17,7 +18,6 @@ inline constexpr const char* kFlexOutStoreName = "flexout.ini";
 inline constexpr const char* kColumnSpecific = "Column Specific";
 inline constexpr const char* kPlane = "Plane";
 inline constexpr const char* kGeographic = "Geographic";
-inline constexpr const char* kGeographicCoordinates = "Geographic Coordinates";
 
 // The columns a format may use. The names (FlexColumnName) are both the
 // texts shown and the keys stored, "Convergance Angle" included.

@@ -10,6 +10,7 @@
 #include <thread>
 
 #include "app/dialogs/GuiMain.h"
+#include "editor/TextEditorWindow.h"
 #include "platform/qt/BackgroundRun.h"
 #include "platform/qt/QtUi.h"
 
@@ -56,7 +57,7 @@ void AnswerNextBox(QString& seen, QMessageBox::StandardButton press) {
 }
 
 TEST(QtUiTest, BoxesAskedForByAWorkerAreShownByTheGuiThread) {
-  QtUi ui;
+  QtUi ui(OpenTextEditor);
   QString seen;
   AnswerNextBox(seen, QMessageBox::No);
   Answer answer = Answer::Ok;
@@ -106,7 +107,7 @@ TEST(QtUiTest, LongWorkKeepsTheWindowsAliveAndShowsProgress) {
 // A question asked in the first moments of a run stays in front: the busy
 // window neither covers it nor blocks it, and comes back after the answer.
 TEST(QtUiTest, BusyWindowStepsAsideForAQuestion) {
-  QtUi ui;
+  QtUi ui(OpenTextEditor);
   auto busyShown = [] {
     for (QWidget* w : QApplication::topLevelWidgets())
       if (qobject_cast<BusyProgress*>(w) && w->isVisible()) return true;

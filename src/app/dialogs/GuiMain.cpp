@@ -6,7 +6,9 @@
 
 #include "app/AppContext.h"
 #include "app/dialogs/TranslateWindow.h"
+#include "editor/TextEditorWindow.h"
 #include "platform/ConsoleUi.h"
+#include "platform/qt/QtSettings.h"
 #include "platform/qt/QtUi.h"
 
 namespace zv {
@@ -39,6 +41,9 @@ int RunWithChosenUi(int& argc, char** argv, const std::string& argumentText) {
       UiKind::Console) {
     ConsoleUi ui(std::cin, std::cout, std::cerr);
     AppContext ctx(ui, ExecutableFolder());
+    // The settings the user last accepted in the window.
+    QtSettings settings;
+    ctx.settings = &settings;
     WindowOpener needsDisplay = [](AppContext& c) {
       c.ui.exclaim(
           "The Translate window needs a display (DISPLAY or WAYLAND_DISPLAY).\r\n"
@@ -54,8 +59,10 @@ int RunWithChosenUi(int& argc, char** argv, const std::string& argumentText) {
   }
   QApplication app(argc, argv);
   QApplication::setApplicationName(kAppTitle);
-  QtUi ui;
+  QtUi ui(OpenTextEditor);
   AppContext ctx(ui, ExecutableFolder());
+  QtSettings settings;
+  ctx.settings = &settings;
   WindowOpener openWindow = [&app](AppContext& c) {
     TranslateWindow window(c);
     // Closing the main window ends the program: the other windows close too

@@ -9,30 +9,13 @@
 #include <QMessageBox>
 #include <QPointer>
 #include <QRegularExpression>
-#include <QThread>
-#include <type_traits>
 
-#include "editor/TextEditorWindow.h"
 #include "platform/qt/BackgroundRun.h"
+#include "platform/qt/GuiThread.h"
 
 namespace zv {
 
 namespace {
-
-// Runs f on the GUI thread and returns its result; a worker thread waits.
-template <typename F>
-auto OnGuiThread(F&& f) -> std::invoke_result_t<F> {
-  using R = std::invoke_result_t<F>;
-  if (QThread::currentThread() == qApp->thread()) return f();
-  if constexpr (std::is_void_v<R>) {
-    QMetaObject::invokeMethod(qApp, f, Qt::BlockingQueuedConnection);
-  } else {
-    R result{};
-    QMetaObject::invokeMethod(
-        qApp, [&] { result = f(); }, Qt::BlockingQueuedConnection);
-    return result;
-  }
-}
 
 QString Title(const std::string& title) {
   return QString::fromStdString(title.empty() ? std::string(kAppTitle) : title);
@@ -74,21 +57,6 @@ void KeepTitleWhole(QMessageBox& box) {
     grid->addItem(new QSpacerItem(width, 0, QSizePolicy::Minimum, QSizePolicy::Expanding),
                   grid->rowCount(), 0, 1, grid->columnCount());
   }
-}
-
-TextEditorWindow* NewEditor(Ui& ui, const std::string& path, const std::string& type,
-                            EditorMode mode) {
-  auto* editor = new TextEditorWindow(ui);
-  editor->setAttribute(Qt::WA_DeleteOnClose);
-  // Shown first: a long file then fills a visible window behind its progress.
-  editor->show();
-  if (path.empty() && mode == EditorMode::Editor) {
-    editor->showNew(QString::fromStdString(type));
-  } else {
-    editor->showTextEditor(QString::fromStdString(path), QString::fromStdString(type),
-                           mode == EditorMode::Viewer);
-  }
-  return editor;
 }
 
 }  // namespace
@@ -199,20 +167,19 @@ std::optional<std::string> QtUi::input(const std::string& prompt, const std::str
 void QtUi::viewText(const std::string& path, const std::string& typeDescription) {
   OnGuiThread([&] {
     WaitForUser wait(busy_);
-    QPointer<TextEditorWindow> viewer = NewEditor(*this, path, typeDescription, EditorMode::Viewer);
+    QPointer<QWidget> viewer =
+        openEditor_ ? openEditor_(*this, path, typeDescription, EditorMode::Viewer) : nullptr;
     // Wait for the viewer to close while every window keeps working.
+    if (!viewer) return;
     QEventLoop loop;
     QObject::connect(viewer, &QObject::destroyed, &loop, &QEventLoop::quit);
-    if (viewer) loop.exec();
+    loop.exec();
   });
 }
 
 bool QtUi::openEditor(const std::string& path, const std::string& typeDescription,
                       EditorMode mode) {
-  return OnGuiThread([&] {
-    NewEditor(*this, path, typeDescription, mode);
-    return true;
-  });
+  return OnGuiThread([&] { return openEditor_ && openEditor_(*this, path, typeDescription, mode); });
 }
 
 std::optional<std::string> QtUi::chooseFile(const FileDialogRequest& request) {

@@ -1,10 +1,12 @@
 #pragma once
 // Qt implementation of the UI seam: message boxes, the input box, file
-// dialogs, the busy pointer and text editor windows. It may be called from a
-// worker thread: every window is then shown by the GUI thread while the
-// worker waits.
+// dialogs, the busy pointer and text editor windows (made by the opener it is
+// given). It may be called from a worker thread: every window is then shown
+// by the GUI thread while the worker waits.
 
 #include <QStringList>
+#include <QWidget>
+#include <functional>
 
 #include "platform/Ui.h"
 
@@ -12,6 +14,12 @@ namespace zv {
 
 class QtUi : public Ui {
  public:
+  // Opens a text editor window that deletes itself when closed; nullptr
+  // when none could be opened.
+  using EditorOpener = std::function<QWidget*(Ui& ui, const std::string& path,
+                                              const std::string& typeDescription, EditorMode)>;
+  explicit QtUi(EditorOpener openEditor = {}) : openEditor_(std::move(openEditor)) {}
+
   Answer message(const std::string& text, Icon icon, Buttons buttons,
                  const std::string& title) override;
   std::optional<std::string> input(const std::string& prompt, const std::string& title,
@@ -24,6 +32,7 @@ class QtUi : public Ui {
   bool hasWindows() const override { return true; }
 
  private:
+  EditorOpener openEditor_;
   bool busy_ = false;  // GUI thread only
 };
 
