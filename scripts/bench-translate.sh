@@ -1,26 +1,39 @@
 #!/bin/sh
-# Benchmarks an unattended control to points-and-chains translation of a
-# generated control file: median wall time, peak memory and throughput.
-# usage: scripts/bench-translate.sh [points] [runs]
+# Benchmarks an unattended translation of a generated control file: median
+# wall time, peak memory and throughput.
+#   translate: control to points-and-chains (default 1,000,000 points)
+#   reproject: control reprojected from Wisconsin Central to Wisconsin South,
+#              both NAD 83, no datum shift (default 100,000 points)
+# usage: scripts/bench-translate.sh [translate|reproject] [points] [runs]
 set -e
 cd "$(dirname "$0")/.."
-POINTS=${1:-1000000}
-RUNS=${2:-5}
-sh scripts/build.sh >/dev/null
+MODE=${1:-translate}
+RUNS=${3:-5}
 WORK=$(mktemp -d)
 trap 'rm -rf "$WORK"' EXIT
+case "$MODE" in
+  translate)
+    POINTS=${2:-1000000}
+    JOB="CTL2PAC|$WORK/big.ctl|$WORK/big.out" ;;
+  reproject)
+    POINTS=${2:-100000}
+    printf '[Coordinate Conversion]\r\nOutput Coordinate System=State Plane 1983\r\nOutput Zone=Wisconsin South 4803\r\nOutput Horizontal Datum=NAD 83\r\nOutput Horizontal Units=U.S. Survey Feet\r\nOutput Vertical Datum=NAVD 88\r\nOutput Vertical Units=U.S. Survey Feet\r\nScale Factor=1\r\nConvergence Angle=1\r\nLat Long=1\r\nGeoid Heights=0\r\n' >"$WORK/settings.TRN"
+    JOB="CTLREPROJ|$WORK/big.ctl|$WORK/big.out|$WORK/settings.TRN" ;;
+  *) echo "usage: $0 [translate|reproject] [points] [runs]" >&2; exit 2 ;;
+esac
+sh scripts/build.sh >/dev/null
 build/bench/translate/zv_make_control "$POINTS" "$WORK/big.ctl"
 IN_MB=$(du -m "$WORK/big.ctl" | cut -f1)
 for i in $(seq "$RUNS"); do
-  rm -f "$WORK/big.pac"
-  /usr/bin/time -f "%e %M" -o "$WORK/time.$i" build/app/zurevazidu "-t|CTL2PAC|$WORK/big.ctl|$WORK/big.pac" </dev/null
+  rm -f "$WORK/big.out"
+  ZUREVAZIDU_UI=console /usr/bin/time -f "%e %M" -o "$WORK/time.$i" build/app/zurevazidu "-t|$JOB" </dev/null
 done
-OUT_MB=$(du -m "$WORK/big.pac" | cut -f1)
-cat "$WORK"/time.* | sort -n | awk -v n="$RUNS" -v inmb="$IN_MB" -v outmb="$OUT_MB" -v pts="$POINTS" '
+OUT_MB=$(du -m "$WORK/big.out" | cut -f1)
+cat "$WORK"/time.* | sort -n | awk -v n="$RUNS" -v inmb="$IN_MB" -v outmb="$OUT_MB" -v pts="$POINTS" -v mode="$MODE" '
   { wall[NR] = $1; if ($2 > mem) mem = $2 }
   END {
     med = wall[int((n + 1) / 2)]
-    printf "points %d, input %d MB, output %d MB, runs %d\n", pts, inmb, outmb, n
+    printf "%s: points %d, input %d MB, output %d MB, runs %d\n", mode, pts, inmb, outmb, n
     printf "median wall %.2f s, peak memory %.0f MB\n", med, mem / 1024
     printf "throughput: %.0f MB/s read+write (input %.0f MB/s, output %.0f MB/s over the whole run)\n", (inmb + outmb) / med, inmb / med, outmb / med
   }'

@@ -41,6 +41,9 @@ struct AppContext {
   WorkArea work;
   StartupSettings startup;
   Catalogue catalogue;
+  // The conversion points and settings: they keep the last run's until the
+  // next run replaces them.
+  ConversionState conversion;
 };
 
 // The folder of the running executable.

@@ -8,10 +8,7 @@ namespace zv {
 
 bool ConsoleDialogs::coordinateConversion(AppContext& ctx, ConversionState& state, bool) {
   state.accepted = false;
-  ctx.ui.exclaim(
-      "The Coordinate Conversion dialog needs a display (DISPLAY or WAYLAND_DISPLAY).\r\n"
-      "Reproject a file without it with a configuration file of conversion settings "
-      "(see --help).");
+  ctx.ui.exclaim("The Coordinate Conversion dialog needs a display (DISPLAY or WAYLAND_DISPLAY).");
   return false;
 }
 

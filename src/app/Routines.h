@@ -37,7 +37,8 @@ struct Routine {
 const Routine* FindUnattendedRoutine(std::string_view program);
 
 // Runs a routine of either dispatcher. An error raised below it ends the run
-// here, where it is shown (the busy pointer off first); false then.
+// here, where it is shown (the busy pointer off first); so does a stop asked
+// for by the user ("Translation cancelled."). False then.
 bool RunShowingErrors(Ui& ui, const std::function<bool()>& routine);
 
 // Reads the input with its type's reader and writes it with the output
@@ -45,5 +46,20 @@ bool RunShowingErrors(Ui& ui, const std::function<bool()>& routine);
 bool ConvertFile(AppContext& ctx, const RoutineCall& call);
 // Filters the input into the output under the configuration's commands.
 bool ReplaceRoutine(AppContext& ctx, const RoutineCall& call);
+
+// Reprojection, in three steps shared by both dispatchers. The first reads
+// the input: its header's coordinate reference becomes the input side of the
+// conversion settings, its points the conversion points.
+bool ReadForReprojection(AppContext& ctx, const RoutineCall& call);
+// The second converts the points with the settings of the configuration file
+// (a "Coordinate Conversion" section), or else those last accepted in the
+// Coordinate Conversion dialog; settings the dialog would refuse are refused
+// alike, naming the key.
+bool ConvertWithStoredSettings(AppContext& ctx, const RoutineCall& call);
+// The third fills the output side from the input header and the conversion,
+// and, when the conversion was accepted, writes it.
+bool WriteReprojection(AppContext& ctx, const RoutineCall& call);
+// The unattended reprojection: all three.
+bool MultiPointRoutine(AppContext& ctx, const RoutineCall& call);
 
 }  // namespace zv

@@ -17,6 +17,7 @@
 #include "app/AppContext.h"
 #include "app/Dispatcher.h"
 #include "platform/Numbers.h"
+#include "platform/Progress.h"
 #include "platform/Strings.h"
 
 namespace zv {
@@ -168,6 +169,8 @@ int RunProgram(AppContext& ctx, const std::string& argumentText, const WindowOpe
       }
       job.inputPath = f[2];
       job.outputPath = f[3];
+      // SIGINT and SIGTERM stop the run at the next point, as Cancel does.
+      StopOnSignals();
       return Translate(ctx, job) ? 0 : 1;
     }
     case StartMode::Preset:

@@ -354,10 +354,13 @@ bool CoordConvertRoutine(AppContext& ctx, const RoutineCall&) {
   // pass for the answer of this one.
   std::error_code ec;
   fs::remove(ctx.appPath(kExchangeOutput), ec);
-  // The manual mode needs the Coordinate Conversion window, which this
-  // routine does not have.
-  ConversionState state;
-  return BatchExchange(ctx.ui, ctx.appFolder, state, nullptr);
+  ConversionState& state = ctx.conversion;
+  state = ConversionState{};
+  // The manual mode: the Coordinate Conversion dialog with the request as
+  // its input side.
+  return BatchExchange(ctx.ui, ctx.appFolder, state, [&ctx](ConversionState& s) {
+    return ctx.dialogs->coordinateConversion(ctx, s, /*presetInput=*/true);
+  });
 }
 
 }  // namespace zv

@@ -31,6 +31,27 @@ bool RunConvertFile(WindowRun& run) {
   return true;
 }
 
+// The Coordinate Conversion dialog asks for the point, converts it and
+// shows the report; no completion message follows.
+bool RunSinglePoint(WindowRun& run) {
+  ConversionState& state = run.ctx.conversion;
+  state.singlePoint = true;
+  state.accepted = false;
+  state.points.assign(1, SurveyPoint{});
+  run.ctx.ui.setBusy(false);
+  return run.ctx.dialogs->coordinateConversion(run.ctx, state, /*presetInput=*/false);
+}
+
+bool RunMultiPoint(WindowRun& run) {
+  if (!RunLong(run, [&] { return ReadForReprojection(run.ctx, run.call); })) return false;
+  run.ctx.ui.setBusy(false);
+  run.ctx.dialogs->coordinateConversion(run.ctx, run.ctx.conversion, /*presetInput=*/true);
+  run.ctx.ui.setBusy(true);
+  if (!RunLong(run, [&] { return WriteReprojection(run.ctx, run.call); })) return false;
+  Complete(run, kTranslationComplete, kAppTitle);
+  return true;
+}
+
 bool RunReplace(WindowRun& run) {
   if (!CheckConfiguration(run)) return false;
   const RoutineCall& c = run.call;
@@ -94,6 +115,8 @@ std::vector<WindowRoutine> MakeWindowRoutines() {
   std::vector<WindowRoutine> routines = {
       {"ConvertFile", RunConvertFile},
       {"Replace", RunReplace},
+      {"SinglePoint", RunSinglePoint},
+      {"MultiPoint", RunMultiPoint},
   };
   for (const ToolRoutine& tool : ToolRoutines()) routines.push_back({tool.program, nullptr, &tool});
   return routines;

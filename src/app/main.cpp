@@ -24,7 +24,10 @@ const char* kUsage =
     "\n"
     "The definition is the name of a file in UTIFiles/ of the application folder\n"
     "(the folder of this program), without its .uti ending. Fields are separated\n"
-    "by '|'; quote the whole argument in a shell.\n"
+    "by '|'; quote the whole argument in a shell. A reprojection (CTLREPROJ,\n"
+    "PACREPROJ, ...) takes its conversion settings from the configuration file,\n"
+    "a [Coordinate Conversion] section as in TRNFiles/UTM16N-METRES.TRN, or else\n"
+    "from those last accepted in the window.\n"
     "Exit status: 0 done, 1 refused, failed or cancelled, 2 command-line error.\n"
     "Without a display, messages go to standard error and questions read their\n"
     "answer from standard input (y/n; end of input answers No or Cancel).\n";

@@ -19,6 +19,7 @@
 #include <filesystem>
 
 #include "editor/FindReplaceDialog.h"
+#include "editor/PlanView.h"
 #include "platform/TextIo.h"
 #include "platform/Ui.h"
 #include "survey/Listing.h"
@@ -138,6 +139,8 @@ void TextEditorWindow::buildMenus() {
   viewMenu_->setObjectName("mnuView");
   viewListAction_ = add(viewMenu_, "mnuViewList", "&List", &TextEditorWindow::viewList);
   viewRecordAction_ = add(viewMenu_, "mnuViewRecord", "&Record", &TextEditorWindow::viewRecord);
+  viewMenu_->addSeparator();
+  add(viewMenu_, "mnuViewPlan", "&Plan View", [this] { OpenPlanView(ui_, Std(path_)); });
   viewListAction_->setCheckable(true);
   viewRecordAction_->setCheckable(true);
   setViewChecks();

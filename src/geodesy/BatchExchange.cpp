@@ -353,6 +353,13 @@ bool BatchExchange(Ui& ui, const std::string& appFolder, ConversionState& state,
           "available in this run.");
       return fail();
     }
+    // Geographic points are offered as what they are: latitudes and
+    // longitudes in the packed format of the request.
+    if (!request.grid) {
+      s.inputCoordinateSystem = kGeographicCoordinates;
+      s.inputZone.clear();
+      s.inputHorizontalUnits = kFormatPacked;
+    }
     state.accepted = manual(state);
     if (!state.accepted) return fail();
   } else {

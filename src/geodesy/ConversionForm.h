@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "geodesy/ConversionDriver.h"
+#include "platform/Error.h"
 #include "platform/Settings.h"
 #include "platform/Ui.h"
 #include "survey/SurveyModel.h"
@@ -61,9 +62,17 @@ struct ManualEntrySetup {
   bool geographic = false;   // latitude and longitude, else northing and easting
   bool heightWanted = true;  // the height field is offered
   std::string verticalUnits;
-  std::string heightType;   // "Orthometric" or "Ellipsoid"
-  std::string angleFormat;  // the input horizontal units of a geographic side
+  std::string heightType;       // "Orthometric" or "Ellipsoid"
+  std::string angleFormat;      // the input horizontal units of a geographic side
+  std::string horizontalUnits;  // the input horizontal units of a grid side
 };
+
+// The geoid models the GEOID program knows, in list order.
+std::vector<std::string> GeoidModelNames();
+
+// How the form shows a list that could not be filled: "Error: " + the
+// description + CR LF + "Function: " + the source (exclamation icon).
+void ShowListError(Ui& ui, const ZvError& error);
 
 class ConversionForm {
  public:
@@ -72,13 +81,17 @@ class ConversionForm {
   // Fills both coordinate-system lists (with "Geographic Coordinates"),
   // disables the geoid controls, and selects the remembered values of the
   // store's "Coordinate Conversion" section, each only when its list holds
-  // it. Non-empty fields of `preset` (the input side of a file's header or
-  // an exchange request) take the place of the remembered input side.
-  // A list that cannot be filled throws ZvError.
+  // it, in cascade order (a zone after its coordinate system, a datum after
+  // its zone). When `preset` (the input side of a file's header or an
+  // exchange request) has a non-empty input field, its non-empty input
+  // fields take the place of the whole remembered input side, so the zone's
+  // own datums and units fill what the preset leaves empty. A list that
+  // cannot be filled throws ZvError (the form keeps what was filled).
   void load(const SettingsStore& store, const ConversionSettings* preset = nullptr);
 
   // A choice in a list, as a click does: the cascades and enabling rules.
-  // An entry the list does not hold selects nothing.
+  // An entry the list does not hold changes nothing. A list the cascade
+  // cannot fill throws ZvError.
   void choose(FormSide side, FormField field, const std::string& value);
   // The option boxes; the geoid model list follows the geoid box.
   void setScaleFactor(bool checked);
@@ -94,16 +107,28 @@ class ConversionForm {
 
   // The first failure of the OK checks, in their order; nullopt when all pass.
   std::optional<FormRefusal> validate() const;
-  // The settings as the form holds them (after a passed validation).
+  // The settings as the form holds them (after a passed validation). A
+  // disabled option counts as not ticked; the geoid model goes with geoid
+  // heights only; with input vertical datum "None" the output vertical units
+  // are the input's.
   ConversionSettings settings() const;
   // "Orthometric" or "Ellipsoid", from the input vertical datum's type.
   std::string heightType() const;
   // The manual entry set-up for the current input side.
   ManualEntrySetup manualEntrySetup() const;
-  // Writes every key of the "Coordinate Conversion" section.
+  // Writes every key of the "Coordinate Conversion" section: the lists as
+  // they are selected, the boxes as ticked ("1" or "0").
   void remember(SettingsStore& store) const;
 
  private:
+  FormList& at(FormSide side, FormField field);
+  void chooseSystem(FormSide side);
+  void chooseZone(FormSide side);
+  // The input vertical datum rule: "None" holds the output vertical datum at
+  // "None" and disables the vertical output and the geoid option.
+  void applyInputVerticalDatum();
+  void followGeoid();
+
   std::string appFolder_;
   FormList lists_[2][7];
   FormOption scaleFactor_, convergence_, latLong_, geoid_;
@@ -146,8 +171,12 @@ struct ManualRefusal {
 // The OK checks of the manual entry form; nullopt when they pass.
 std::optional<ManualRefusal> ValidateManualEntry(const ManualEntrySetup& setup,
                                                  const ManualEntryFields& fields);
-// Resets the point and fills it from the checked fields.
-void FillManualPoint(Ui& ui, const ManualEntrySetup& setup, const ManualEntryFields& fields,
+// Resets the point and fills it from the checked fields: latitude and
+// longitude in the set-up's angle format (blanks are separators of the
+// spaced formats and are dropped from the others). False, after a message,
+// when an angle cannot be read; the point's Latitude (or, when only that
+// failed, Longitude) is then -99999.
+bool FillManualPoint(Ui& ui, const ManualEntrySetup& setup, const ManualEntryFields& fields,
                      SurveyPoint& point);
 
 }  // namespace zv

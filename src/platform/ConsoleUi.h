@@ -23,8 +23,11 @@ class ConsoleUi : public Ui {
                   EditorMode mode) override;
   // Reports that a file dialog needs a display; always nullopt.
   std::optional<std::string> chooseFile(const FileDialogRequest& request) override;
+  // Stops the run after SIGINT or SIGTERM once StopOnSignals was called.
+  RunProgress* progress() override { return &stop_; }
 
  private:
+  SignalStop stop_;
   std::istream& in_;
   std::ostream& out_;
   std::ostream& err_;

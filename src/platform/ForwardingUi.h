@@ -33,6 +33,7 @@ class ForwardingUi : public Ui {
   }
   void setBusy(bool on) override { inner_.setBusy(on); }
   bool hasWindows() const override { return inner_.hasWindows(); }
+  RunProgress* progress() override { return inner_.progress(); }
 
  protected:
   Ui& inner() { return inner_; }

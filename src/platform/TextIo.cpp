@@ -16,6 +16,7 @@
 #include <mutex>
 #include <sstream>
 
+#include "platform/Progress.h"
 #include "platform/Strings.h"
 
 namespace zv {
@@ -57,7 +58,7 @@ std::string Utf16Refusal(const std::string& path) {
          "' is UTF-16 text, which can not be read.  Save it as UTF-8 or ANSI text.";
 }
 
-LineReader::LineReader(std::istream& in) : in_(in) {}
+LineReader::LineReader(std::istream& in, RunProgress* progress) : in_(in), progress_(progress) {}
 
 bool LineReader::fill() {
   if (eof_) return false;
@@ -74,11 +75,22 @@ bool LineReader::fill() {
   size_t got = static_cast<size_t>(in_.gcount());
   buf_.resize(old + got);
   if (got == 0 || !in_) eof_ = true;
+  read_ += got;
+  if (progress_) progress_->step(RunStage::Reading, read_, total_);
   return got > 0;
 }
 
 void LineReader::start() {
   started_ = true;
+  if (progress_) {
+    const std::istream::pos_type at = in_.tellg();
+    if (at != std::istream::pos_type(-1) && in_.seekg(0, std::ios::end)) {
+      const std::istream::pos_type end = in_.tellg();
+      if (end >= at) total_ = static_cast<std::uintmax_t>(end - at);
+    }
+    in_.clear();
+    in_.seekg(at);
+  }
   fill();
   utf16_ = LooksLikeUtf16(buf_);
   if (std::string_view(buf_).starts_with("\xEF\xBB\xBF")) pos_ = 3;
@@ -141,12 +153,22 @@ struct TempSlot {
 constexpr int kTempSlots = 16;
 TempSlot g_tempSlots[kTempSlots];
 constexpr int kCleanupSignals[] = {SIGINT, SIGTERM, SIGHUP};
+// 0: signals end the process; 1: SIGINT and SIGTERM ask the run to stop;
+// 2: such a request came.
+std::atomic<int> g_stopState{0};
 
 extern "C" void RemoveTempsAndDie(int sig) {
+  if (sig != SIGHUP) {
+    int expected = 1;
+    if (g_stopState.compare_exchange_strong(expected, 2)) return;
+  }
   for (TempSlot& slot : g_tempSlots)
     if (slot.state.load() == 2) ::unlink(slot.path);
-  // The handler was reset to the default: the signal ends the process once
-  // this handler returns.
+  struct sigaction fallback {};
+  fallback.sa_handler = SIG_DFL;
+  sigemptyset(&fallback.sa_mask);
+  ::sigaction(sig, &fallback, nullptr);
+  // Delivered once this handler returns: the process ends by the signal.
   ::raise(sig);
 }
 
@@ -157,7 +179,6 @@ void InstallCleanupHandlers() {
   std::call_once(once, [] {
     struct sigaction action {};
     action.sa_handler = RemoveTempsAndDie;
-    action.sa_flags = SA_RESETHAND;
     sigemptyset(&action.sa_mask);
     for (int sig : kCleanupSignals) sigaddset(&action.sa_mask, sig);
     for (int sig : kCleanupSignals) {
@@ -351,6 +372,16 @@ bool WriteTextLines(const std::string& path, const std::vector<std::string>& lin
   }
   if (!ok && error) *error = writer.error();
   return ok;
+}
+
+void StopOnSignals() {
+  InstallCleanupHandlers();
+  int expected = 0;
+  g_stopState.compare_exchange_strong(expected, 1);
+}
+
+bool StopRequested() {
+  return g_stopState.load() == 2;
 }
 
 }  // namespace zv

@@ -6,6 +6,7 @@
 // removed when the process is ended by SIGINT, SIGTERM or SIGHUP, and one
 // left by a killed run is removed by the next write of the same file.
 
+#include <cstdint>
 #include <cstdio>
 #include <istream>
 #include <string>
@@ -32,9 +33,13 @@ bool IsUtf16File(const std::string& path);
 std::string Utf16Refusal(const std::string& path);
 inline constexpr const char* kUtf16Title = "Unsupported Text Encoding";
 
+class RunProgress;
+
 class LineReader {
  public:
-  explicit LineReader(std::istream& in);
+  // With a progress, every chunk read is reported (and a stop request
+  // ends the read by its exception).
+  explicit LineReader(std::istream& in, RunProgress* progress = nullptr);
   // The next line without its line end; false at the end of the input.
   // The view stays valid until the next call.
   bool next(std::string_view& line);
@@ -55,6 +60,8 @@ class LineReader {
   // the buffer; npos: not searched yet).
   size_t nextCr_ = std::string::npos;
   size_t nextLf_ = std::string::npos;
+  RunProgress* progress_;
+  std::uintmax_t read_ = 0, total_ = 0;
   bool eof_ = false;
   bool started_ = false;
   bool utf16_ = false;

@@ -6,6 +6,7 @@
 #include <string>
 
 #include "Version.h"
+#include "platform/Progress.h"
 
 namespace zv {
 
@@ -53,6 +54,9 @@ class Ui {
   virtual void setBusy(bool) {}
   // False when the implementation cannot show windows (the console).
   virtual bool hasWindows() const { return false; }
+  // Where the running routine reports its progress and learns of a stop
+  // request; nullptr when nobody listens.
+  virtual RunProgress* progress() { return nullptr; }
 
   // Shorthands for the common boxes.
   void inform(const std::string& text, const std::string& title = kAppTitle) {

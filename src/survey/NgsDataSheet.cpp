@@ -49,7 +49,7 @@ void AppendTagged(std::string& field, std::string_view prefix, std::string_view 
 class NgsReader {
  public:
   NgsReader(Ui& ui, std::istream& in, const std::string& path)
-      : ui_(ui), in_(in), reader_(in), path_(path) {}
+      : ui_(ui), in_(in), reader_(in, ui.progress()), path_(path) {}
 
   bool read(WorkArea& work) {
     std::string_view line;

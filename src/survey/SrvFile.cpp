@@ -84,7 +84,7 @@ double ConvertLength(double value, const std::string& from, const std::string& t
 class SrvReader {
  public:
   SrvReader(Ui& ui, std::istream& in, const std::string& path)
-      : ui_(ui), in_(in), reader_(in), path_(path) {}
+      : ui_(ui), in_(in), reader_(in, ui.progress()), path_(path) {}
 
   bool read(WorkArea& work) {
     ReservePoints(points_, BytesLeft(in_) / 32);
@@ -360,7 +360,9 @@ class SrvWriter {
     writeHeader(header, code.empty() ? unit_ : code);
     for (SurveyPoint& p : work_.OutputPoints) p.NotYetWritten = true;
     std::vector<Block> blocks = prepareBlocks();
+    size_t done = 0;
     for (SurveyPoint& p : work_.OutputPoints) {
+      StepItems(ui_.progress(), RunStage::Writing, done++, work_.OutputPoints.size());
       if (!p.NotYetWritten) continue;
       AppendPointLine(out_.buffer(), p, unit_);
       out_.lineDone();

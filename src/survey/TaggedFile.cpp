@@ -115,7 +115,7 @@ class TaggedReader {
 
   // `sizeHint` is the size of the input in bytes when known (0 otherwise).
   bool read(std::istream& in, std::uintmax_t sizeHint) {
-    LineReader reader(in);
+    LineReader reader(in, ui_.progress());
     std::string_view line;
     std::uintmax_t bytesRead = 0;
     while (reader.next(line)) {
@@ -629,7 +629,12 @@ bool WriteTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const Tagg
   }
   TaggedWriter writer(ui, out, format, work, unit);
   writer.header(h);
-  for (SurveyPoint& p : work.OutputPoints) writer.point(p);
+  RunProgress* progress = ui.progress();
+  const size_t count = work.OutputPoints.size();
+  for (size_t i = 0; i < count; ++i) {
+    StepItems(progress, RunStage::Writing, i, count);
+    writer.point(work.OutputPoints[i]);
+  }
   if (format.hasChains && !work.OutputChains.empty()) writer.chains(work.OutputChains);
   if (!out.commit()) {
     ReportWriteFailure(ui, path, out.error());

@@ -44,7 +44,7 @@ double ToMetres(double value, const std::string& unit) {
 
 class WsiReader {
  public:
-  WsiReader(Ui& ui, std::istream& in) : ui_(ui), in_(in), reader_(in) {}
+  WsiReader(Ui& ui, std::istream& in) : ui_(ui), in_(in), reader_(in, ui.progress()) {}
 
   bool read(WorkArea& work) {
     ReservePoints(points_, BytesLeft(in_) / 64);
@@ -302,6 +302,7 @@ class WsiWriter {
     bool benchMarks = name == kBenchMarks;
     for (size_t i : members) {
       SurveyPoint& p = work_.OutputPoints[i];
+      StepItems(ui_.progress(), RunStage::Writing, written_++, work_.OutputPoints.size());
       writeRow(p);
       if (benchMarks) {
         for (std::string_view tag : {"OW:", "TY:", "NM:"}) {
@@ -378,6 +379,7 @@ class WsiWriter {
   WorkArea& work_;
   const std::string& path_;
   TextFileWriter out_;
+  size_t written_ = 0;  // rows written, for the progress
   bool ellipsoidHeights_ = false;
   std::string number_;
   OutputNotes notes_;

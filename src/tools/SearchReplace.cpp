@@ -285,7 +285,7 @@ bool RunCommands(Ui& ui, std::istream& input, const std::string& inputPath,
     arithmetic[i] = {commands[i].category, commands[i].op, commands[i].operand,
                      commands[i].angleOperand};
   }
-  LineReader reader(input);
+  LineReader reader(input, ui.progress());
   if (reader.isUtf16()) {
     ui.exclaim(Utf16Refusal(inputPath), kUtf16Title);
     return false;

@@ -207,7 +207,7 @@ bool ReadFlexInStream(Ui& ui, std::istream& in, const std::string& path, const F
   SurveyPoint point;
   ResetPoint(point);
 
-  LineReader lines(in);
+  LineReader lines(in, ui.progress());
   if (lines.isUtf16()) {
     ui.exclaim(Utf16Refusal(path), kUtf16Title);
     return false;

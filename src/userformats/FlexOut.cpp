@@ -314,7 +314,9 @@ bool FlexOut(Ui& ui, WorkArea& work, const std::string& appFolder, const std::st
   Trouble split;
   std::string line;
   std::string fieldText;
+  size_t done = 0;
   for (SurveyPoint& p : work.OutputPoints) {
+    StepItems(ui.progress(), RunStage::Writing, done++, work.OutputPoints.size());
     ++lineNo;
     const Originals o{p.Northing,     p.Easting,       p.Elevation, p.EllipsoidHeight,
                       p.GeoidHeight,  p.Latitude,      p.Longitude, p.NorthingError,

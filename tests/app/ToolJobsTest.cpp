@@ -13,6 +13,7 @@
 #include "app/WindowRoutines.h"
 #include "platform/Process.h"
 #include "platform/ScriptedUi.h"
+#include "support/Boxes.h"
 #include "support/TempDir.h"
 
 namespace zv {
@@ -21,6 +22,7 @@ namespace {
 namespace fs = std::filesystem;
 using test::CrLf;
 using test::ReadFile;
+using test::Take;
 
 const std::string kCtl = "VORN Control Files (*.CTL)";
 
@@ -136,10 +138,10 @@ TEST_F(ToolJobsTest, LlevWithoutResultIsReportedAndTheInputKept) {
   tool("LLEV.EXE");
   // An input ending in "prj" is where the result would be: it is no result.
   for (const char* name : {"run.lev", "run.prj"}) {
-    ui.boxes.clear();
     const std::string lev = work.write(name, "x\r\n");
     EXPECT_FALSE(LlevToolJob(ui, lev, output, 0, place));
-    EXPECT_EQ(ui.onlyText(), "LLEV.EXE left no result file '" + work.file("run.prj") + "'.");
+    EXPECT_EQ(Take(ui),
+              "E VORN Zurevazidu: LLEV.EXE left no result file '" + work.file("run.prj") + "'.");
     EXPECT_FALSE(fs::exists(output));
     EXPECT_EQ(ReadFile(lev), "x\r\n");
   }
@@ -149,13 +151,13 @@ TEST_F(ToolJobsTest, MissingOrUnstartableToolStopsTheRunByName) {
   // Every tool stops the window's run by name, without completion or output.
   for (const char* program : {"CONVERT.EXE", "PCPT2PI.EXE", "PI2PCPT.EXE", "EXTRACT.EXE",
                               "CTL2ARE.EXE", "ALI2FLA.EXE", "LLEV.EXE", "SORT.EXE"}) {
-    ui.boxes.clear();
     EXPECT_FALSE(window(program, trn)) << program;
-    ASSERT_FALSE(ui.boxes.empty()) << program;
-    EXPECT_EQ(ui.boxes.back().text,
-              std::string("The program '") + program + "' was not found in '" + pintrel + "'.");
-    EXPECT_TRUE(ui.boxes.back().icon == Icon::Exclamation && ui.editors.empty()) << program;
+    const std::string boxes = Take(ui);
+    EXPECT_TRUE(boxes.ends_with(std::string("E Program Not Found: The program '") + program +
+                                "' was not found in '" + pintrel + "'."))
+        << boxes;
   }
+  EXPECT_TRUE(ui.editors.empty());
   EXPECT_FALSE(translate("PCPT2PI.EXE"));  // the dispatcher alike
   EXPECT_EQ(ui.boxes.back().text, "The program 'PCPT2PI.EXE' was not found in '" + pintrel + "'.");
 
@@ -185,13 +187,11 @@ TEST_F(ToolJobsTest, DispatcherShowsTheToolReports) {
   tool("CONVERT.EXE", "printf 'XX\\r\\n' > Convert.out\n");
   ASSERT_TRUE(translate("CONVERT.EXE", trn));
   EXPECT_EQ(job("CONVERT.EXE"), CrLf({input, output, work.file("CODES")}));
-  EXPECT_EQ(ui.onlyText(), "The following codes had no match.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: The following codes had no match.");
   EXPECT_EQ(ui.viewed, std::vector<std::string>{"Out File (*.OUT): " + pintrel + "/Convert.out"});
   EXPECT_TRUE(fs::exists(pintrel + "/Convert.out"));  // the unmatched codes stay
   // SORT's free point numbers are shown and deleted.
   tool("SORT.EXE", "printf '1-99\\r\\n' > PTNUM.INF\n");
-  ui.boxes.clear();
   ASSERT_TRUE(translate("SORT.EXE"));
   EXPECT_EQ(ui.viewed.back(), "Available Point Numbers: " + pintrel + "/PTNUM.INF");
   EXPECT_FALSE(fs::exists(pintrel + "/PTNUM.INF"));
@@ -227,17 +227,15 @@ TEST_F(ToolJobsTest, WindowShowsUnmatchedCodesInsteadOfCompletion) {
   tool("CONVERT.EXE", "[ -f make-report ] && printf 'XX\\r\\n' > Convert.out\nexit 0\n");
   // No report: the usual completion and the output in a viewer.
   ASSERT_TRUE(window("CONVERT.EXE", trn));
-  EXPECT_EQ(ui.onlyText(), "Translation Complete.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: Translation Complete.");
   EXPECT_EQ(ui.editors, std::vector<std::string>{"viewer: " + kCtl + ": " + output});
 
   // A report: its message and the report in a viewer, no completion and no
   // output; the report is gone afterwards.
   app.write("Pintrel/make-report", "");
-  ui.boxes.clear();
   ui.editors.clear();
   ASSERT_TRUE(window("CONVERT.EXE", trn));
-  EXPECT_EQ(ui.onlyText(), "The following codes had no match.");
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: The following codes had no match.");
   EXPECT_EQ(ui.editors, std::vector<std::string>{"viewer: Out File (*.OUT): " + report});
   EXPECT_FALSE(fs::exists(report));
 
@@ -254,14 +252,12 @@ TEST_F(ToolJobsTest, WindowSortNeedsItsPointNumberReport) {
   tool("SORT.EXE", "[ -f make-report ] && printf '1-99\\r\\n' > PTNUM.INF\nexit 0\n");
   ASSERT_FALSE(window("SORT.EXE"));
   EXPECT_EQ(job("SORT.EXE"), CrLf({input, output}));
-  EXPECT_EQ(ui.onlyText(), "The Translation appears to have failed.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: The Translation appears to have failed.");
   EXPECT_TRUE(ui.editors.empty());
 
   // Completion, the output (made by the tool), then the free point numbers.
   app.write("Pintrel/make-report", "");
   work.write("out.txt", "sorted\r\n");
-  ui.boxes.clear();
   ASSERT_TRUE(window("SORT.EXE"));
   EXPECT_EQ(ui.onlyText(), "Translation Complete.");
   EXPECT_EQ(ui.editors, (std::vector<std::string>{"viewer: " + kCtl + ": " + output,
@@ -272,12 +268,12 @@ TEST_F(ToolJobsTest, WindowSortNeedsItsPointNumberReport) {
 TEST_F(ToolJobsTest, WindowChecksTheConfigurationThenAsks) {
   for (const char* program : {"EXTRACT.EXE", "CONVERT.EXE"}) {
     tool(program);
-    ui.boxes.clear();
     ASSERT_FALSE(window(program)) << program;
-    EXPECT_EQ(ui.onlyText(), "You must specify a configuration file to use for this translation.");
+    EXPECT_EQ(
+        Take(ui),
+        "E VORN Zurevazidu: You must specify a configuration file to use for this translation.");
     EXPECT_FALSE(ran(program));
   }
-  ui.boxes.clear();
   ui.answers.push_back(Answer::Yes);
   ASSERT_TRUE(window("EXTRACT.EXE", trn));
   ASSERT_EQ(ui.boxes.size(), 2u);

@@ -15,6 +15,7 @@
 #include "editor/FindReplaceDialog.h"
 #include "editor/TextEditorWindow.h"
 #include "platform/ScriptedUi.h"
+#include "support/Boxes.h"
 #include "support/TempDir.h"
 
 namespace zv {
@@ -22,6 +23,7 @@ namespace {
 
 using test::CrLf;
 using test::ReadFile;
+using test::Take;
 
 class EditorTest : public ::testing::Test {
  protected:
@@ -82,8 +84,7 @@ TEST_F(EditorTest, ViewerHidesTheEditingMenusAndShowsViewsForTaggedFiles) {
 
 TEST_F(EditorTest, MissingFileIsReportedAndStatusBarFollowsTheCaret) {
   editor.showTextEditor(QString::fromStdString(dir.file("gone.OUT")), "Out File (*.OUT)", false);
-  EXPECT_EQ(ui.onlyText(), "The file '" + dir.file("gone.OUT") + "' doesn't exist.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
+  EXPECT_EQ(Take(ui), "E VORN Zurevazidu: The file '" + dir.file("gone.OUT") + "' doesn't exist.");
   EXPECT_FALSE(text()->isReadOnly());
 
   text()->setPlainText("first\nsecond line\nthird");
@@ -103,8 +104,7 @@ TEST_F(EditorTest, FindStepsThroughOccurrencesWithTheOptions) {
   EXPECT_EQ((std::vector{next(), next()}), (std::vector{0, 5}));
   d->findChild<QCheckBox*>("chkFRMatchWord")->setChecked(true);
   EXPECT_EQ((std::vector{next(), next()}), (std::vector{18, -1}));  // skips "treetop"
-  EXPECT_EQ(ui.onlyText(), "Search String Not Found.");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Information);
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: Search String Not Found.");
   d->findChild<QCheckBox*>("chkFRMatchWord")->setChecked(false);
   d->findChild<QCheckBox*>("chkFRMatchCase")->setChecked(true);
   caretAt(0);
@@ -124,19 +124,17 @@ TEST_F(EditorTest, ReplaceAndReplaceAllCountWhatTheyChanged) {
   EXPECT_EQ(text()->textCursor().selectedText(), "TREE");
   EXPECT_FALSE(d->replace());
   EXPECT_EQ(text()->toPlainText(), "FE:OAK\nFE:POLE\nFE:OAK\n");
-  EXPECT_EQ(ui.boxes.back().text, "Search String Not Found.");
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: Search String Not Found.");
 
   // A replacement holding the search text is not replaced again.
-  ui.boxes.clear();
   caretAt(5);
   d = find("OAK", "OAK TREE OAK");
   EXPECT_EQ(d->replaceAll(), 2);
   EXPECT_EQ(text()->toPlainText(), "FE:OAK TREE OAK\nFE:POLE\nFE:OAK TREE OAK\n");
-  EXPECT_EQ(ui.onlyText(), "Replaced 'OAK' with 'OAK TREE OAK' 2 time(s).");
+  EXPECT_EQ(Take(ui).substr(1), " VORN Zurevazidu: Replaced 'OAK' with 'OAK TREE OAK' 2 time(s).");
   EXPECT_EQ(text()->textCursor().position(), 5);
   EXPECT_TRUE(editor.changed());
 
-  ui.boxes.clear();
   caretAt(9);
   d = find("ELM", "X");
   EXPECT_EQ(d->replaceAll(), 0);
@@ -158,8 +156,7 @@ TEST_F(EditorTest, SavingWritesCrLfAndTheQuestionGuardsChanges) {
   typeAtEnd("scratch");
   ui.answers.push_back(Answer::No);
   editor.fileNew();
-  EXPECT_EQ(ui.onlyText(), "Changes have been made.  Would you like to save them?");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::None);
+  EXPECT_EQ(Take(ui), "  VORN Zurevazidu: Changes have been made.  Would you like to save them?");
   EXPECT_EQ(text()->toPlainText(), "");
   EXPECT_EQ(editor.windowTitle(), "VORN Text Editor");
 
@@ -167,7 +164,6 @@ TEST_F(EditorTest, SavingWritesCrLfAndTheQuestionGuardsChanges) {
   // keeps the window and the text.
   text()->setPlainText("kept");
   editor.show();
-  ui.boxes.clear();
   ui.answers.push_back(Answer::Yes);
   ui.files.push_back(std::nullopt);
   EXPECT_FALSE(editor.close());

@@ -37,6 +37,9 @@ start_session() {
   DISPLAY=":$(cat "$WORK/display")"
   export DISPLAY
   unset WAYLAND_DISPLAY QT_QPA_PLATFORM ZUREVAZIDU_UI
+  # Per-user settings of this session only.
+  XDG_CONFIG_HOME="$WORK/config"
+  export XDG_CONFIG_HOME
   openbox >/dev/null 2>&1 &
   WM_PID=$!
   sleep 0.5

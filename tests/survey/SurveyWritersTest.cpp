@@ -12,6 +12,7 @@
 #include <optional>
 
 #include "platform/ScriptedUi.h"
+#include "support/Boxes.h"
 #include "support/TempDir.h"
 #include "survey/SurveyTestSupport.h"
 #include "survey/TaggedFile.h"
@@ -202,8 +203,7 @@ TEST(SurveyWriters, WriteAsLaidOut) {
       bool written = out.write(ui, work, path);
       if (refusal[0] == '!') {
         EXPECT_FALSE(written);
-        ASSERT_EQ(ui.boxes.size(), 1u);
-        EXPECT_EQ("!" + ui.boxes[0].title + ": " + ui.boxes[0].text, refusal);
+        EXPECT_EQ(Boxes(ui), "E " + refusal.substr(1));
         EXPECT_TRUE(std::filesystem::is_empty(dir.path()));
         break;
       }
@@ -297,11 +297,10 @@ TEST(SurveyWriters, WriteFailuresAreReported) {
         written = f->write(ui, work, path);
       }
       EXPECT_FALSE(written);
-      ASSERT_EQ(ui.boxes.size(), 1u);
-      EXPECT_EQ(ui.boxes[0].title, "File Not Written");
-      EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-      EXPECT_EQ(ui.boxes[0].text.rfind("The file '" + path + "' could not be written.\r\n", 0), 0u);
-      EXPECT_GT(ui.boxes[0].text.size(), path.size() + 35);  // carries the reason
+      const std::string head =
+          "E File Not Written: The file '" + path + "' could not be written.\r\n";
+      const std::string boxes = Boxes(ui);
+      EXPECT_TRUE(boxes.starts_with(head) && boxes.size() > head.size()) << boxes;  // and why
       // Nothing half-written is left: only the folder and what it held.
       EXPECT_EQ(std::distance(std::filesystem::recursive_directory_iterator(dir.path()), {}),
                 c == FolderTarget ? 2 : 0);
@@ -311,13 +310,10 @@ TEST(SurveyWriters, WriteFailuresAreReported) {
 
 // The "Check Output File" warning of a written file, "" for none.
 std::string Warning(const ScriptedUi& ui, const std::string& path) {
-  if (ui.boxes.empty()) return "";
-  EXPECT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].title, "Check Output File");
-  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-  std::string head = "The file '" + path + "' was written, but:\r\n";
-  EXPECT_EQ(ui.boxes[0].text.rfind(head, 0), 0u);
-  return ui.boxes[0].text.substr(head.size());
+  const std::string head = "E Check Output File: The file '" + path + "' was written, but:\r\n";
+  const std::string boxes = Boxes(ui);
+  EXPECT_TRUE(boxes.empty() || boxes.starts_with(head)) << boxes;
+  return boxes.empty() ? "" : boxes.substr(head.size());
 }
 
 // Point names of 8 characters fit every format; a ninth character is cut by

@@ -5,6 +5,7 @@
 #include <iostream>
 
 #include "app/AppContext.h"
+#include "app/dialogs/QtEngineDialogs.h"
 #include "app/dialogs/TranslateWindow.h"
 #include "editor/TextEditorWindow.h"
 #include "platform/ConsoleUi.h"
@@ -63,6 +64,8 @@ int RunWithChosenUi(int& argc, char** argv, const std::string& argumentText) {
   AppContext ctx(ui, ExecutableFolder());
   QtSettings settings;
   ctx.settings = &settings;
+  QtEngineDialogs dialogs(ui);
+  ctx.dialogs = &dialogs;
   WindowOpener openWindow = [&app](AppContext& c) {
     TranslateWindow window(c);
     // Closing the main window ends the program: the other windows close too

@@ -4,6 +4,7 @@
 #include <QEventLoop>
 #include <QPointer>
 #include <QThread>
+#include <algorithm>
 #include <exception>
 #include <limits>
 #include <memory>
@@ -14,14 +15,35 @@ namespace zv {
 
 namespace {
 constexpr int kShowProgressAfterMs = 400;
+constexpr int kFollowEveryMs = 100;
+thread_local RunProgress* t_runProgress = nullptr;
+}  // namespace
+
+void SharedProgress::step(RunStage stage, std::uintmax_t done, std::uintmax_t total) {
+  stage_ = static_cast<int>(stage);
+  permille_ = total == 0 ? 0 : static_cast<int>(std::min<std::uintmax_t>(done, total) * 1000 / total);
+  if (stop_) throw RunCancelled{};
 }
 
-BusyProgress::BusyProgress(const QString& label, QWidget* owner)
-    : QProgressDialog(label, QString(), 0, 0, owner) {
+RunProgress* CurrentRunProgress() {
+  return t_runProgress;
+}
+
+BusyProgress::BusyProgress(const QString& label, QWidget* owner, SharedProgress* progress)
+    : QProgressDialog(label, QString(), 0, 0, owner), label_(label), progress_(progress) {
   setObjectName("frmBusy");
   setWindowTitle(kAppTitle);
   setWindowModality(Qt::WindowModal);
-  setCancelButton(nullptr);
+  if (progress_) {
+    setCancelButtonText("Cancel");
+    connect(this, &QProgressDialog::canceled, this, [this] {
+      progress_->requestStop();
+      setLabelText(label_ + "\nStopping at the next point...");
+    });
+    connect(&follow_, &QTimer::timeout, this, &BusyProgress::follow);
+  } else {
+    setCancelButton(nullptr);
+  }
   setAutoClose(false);
   setAutoReset(false);
   // QProgressDialog shows itself after its own minimum duration: keep it
@@ -34,6 +56,14 @@ BusyProgress::BusyProgress(const QString& label, QWidget* owner)
   });
 }
 
+void BusyProgress::follow() {
+  if (!progress_ || progress_->stage() < 0 || wasCanceled()) return;
+  if (maximum() != 1000) setRange(0, 1000);
+  setValue(progress_->permille());
+  const bool reading = progress_->stage() == static_cast<int>(RunStage::Reading);
+  setLabelText(label_ + (reading ? "\nReading the input" : "\nWriting the output"));
+}
+
 void BusyProgress::startDelay() {
   showLater_.start(kShowProgressAfterMs);
 }
@@ -42,8 +72,10 @@ void BusyProgress::setRunning(bool on) {
   running_ = on;
   if (on) {
     startDelay();
+    if (progress_) follow_.start(kFollowEveryMs);
   } else {
     showLater_.stop();
+    follow_.stop();
     hide();
   }
 }
@@ -77,17 +109,20 @@ BusyPause::~BusyPause() {
 bool RunInBackground(QWidget* owner, const QString& label, const std::function<bool()>& work) {
   bool result = false;
   std::exception_ptr failure;
+  SharedProgress shared;
   std::unique_ptr<QThread> thread(QThread::create([&] {
+    t_runProgress = &shared;
     try {
       result = work();
     } catch (...) {
       failure = std::current_exception();
     }
+    t_runProgress = nullptr;
   }));
   QEventLoop loop;
   QObject::connect(thread.get(), &QThread::finished, &loop, &QEventLoop::quit);
 
-  BusyProgress progress(label, owner);
+  BusyProgress progress(label, owner, &shared);
   thread->start();
   progress.setRunning(true);
   // The finished signal is queued to this thread, so it cannot be missed.

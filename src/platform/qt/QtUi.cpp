@@ -208,6 +208,11 @@ std::optional<std::string> QtUi::chooseFile(const FileDialogRequest& request) {
   });
 }
 
+RunProgress* QtUi::progress() {
+  RunProgress* run = CurrentRunProgress();
+  return run ? run : &signalStop_;
+}
+
 void QtUi::setBusy(bool on) {
   OnGuiThread([&] {
     if (on == busy_) return;

@@ -30,9 +30,13 @@ class QtUi : public Ui {
   std::optional<std::string> chooseFile(const FileDialogRequest& request) override;
   void setBusy(bool on) override;
   bool hasWindows() const override { return true; }
+  // The progress window of the background run on this thread; elsewhere a
+  // stop after SIGINT or SIGTERM.
+  RunProgress* progress() override;
 
  private:
   EditorOpener openEditor_;
+  SignalStop signalStop_;
   bool busy_ = false;  // GUI thread only
 };
 

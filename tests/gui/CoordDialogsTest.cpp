@@ -1,0 +1,340 @@
+// The coordinate conversion dialogs over their logic (tested on its own):
+// controls and focus, Edit Parameters, the manual entry, a typed point all
+// the way to its results window, and the printout.
+
+#include <gtest/gtest.h>
+
+#include <QApplication>
+#include <QCheckBox>
+#include <QComboBox>
+#include <QFontInfo>
+#include <QLineEdit>
+#include <QPlainTextEdit>
+#include <QPrinter>
+#include <QPushButton>
+#include <QRadioButton>
+#include <QRegularExpression>
+#include <QTest>
+#include <QTimer>
+#include <filesystem>
+#include <functional>
+#include <map>
+
+#include "app/AppContext.h"
+#include "app/dialogs/QtEngineDialogs.h"
+#include "coordui/CoordinateConversionDialog.h"
+#include "coordui/CoordinateResultsDialog.h"
+#include "coordui/ManualEntryDialog.h"
+#include "platform/ScriptedUi.h"
+#include "support/TempDir.h"
+
+namespace zv {
+namespace {
+
+using test::ReadFile;
+
+template <typename T>
+T* Child(const QWidget* w, const char* name) {
+  T* c = w->findChild<T*>(name);
+  EXPECT_NE(c, nullptr) << name;
+  return c;
+}
+
+QStringList Items(const QComboBox* box) {
+  QStringList items;
+  for (int i = 0; i < box->count(); ++i) items << box->itemText(i);
+  return items;
+}
+
+void Select(const QWidget* w, const char* list, const QString& item) {
+  QComboBox* box = Child<QComboBox>(w, list);
+  ASSERT_GE(box->findText(item), 0) << item.toStdString();
+  box->setCurrentIndex(box->findText(item));
+}
+
+void Click(const QWidget* w, const char* button) {
+  QTest::mouseClick(Child<QAbstractButton>(w, button), Qt::LeftButton);
+}
+
+std::string Box(const RecordedBox& b) {
+  return b.title + ": " + b.text;
+}
+
+// Runs `step` once the modal dialog named `name` is up; gives up (closing
+// every dialog) after a while so that a missing dialog fails the test.
+void OnModal(const QString& name, std::function<void(QWidget*)> step) {
+  auto* timer = new QTimer(qApp);
+  auto* waited = new int(0);
+  QObject::connect(timer, &QTimer::timeout, [=] {
+    QWidget* w = QApplication::activeModalWidget();
+    if (++*waited > 1000) {
+      ADD_FAILURE() << "no dialog " << name.toStdString();
+      if (w) w->close();
+    } else if (!w || w->objectName() != name) {
+      return;
+    } else {
+      step(w);
+    }
+    timer->stop();
+    timer->deleteLater();
+    delete waited;
+  });
+  timer->start(10);
+}
+
+class CoordDialogsTest : public ::testing::Test {
+ protected:
+  CoordDialogsTest() {
+    for (const char* name : {"zones.ini", "datums.ini", "ellipsoids.ini"}) {
+      std::filesystem::copy_file(std::string(ZV_APP_DIR) + "/" + name, app.file(name));
+    }
+    // Geographic NAD 83 into an Alabama zone: no NGS program runs.
+    const std::map<std::string, std::string> values = {
+        {"Input Coordinate System", "Geographic Coordinates"},
+        {"Input Horizontal Datum", "NAD 83"},
+        {"Input Horizontal Units", "DDD MM SS.ssss"},
+        {"Input Vertical Datum", "NAVD 88"},
+        {"Input Vertical Units", "Meters"},
+        {"Output Coordinate System", "State Plane 1983"},
+        {"Output Zone", "Alabama East 0101"},
+        {"Convergence Angle", "1"}};
+    for (const auto& [key, value] : values) store.save(kConversionSection, key, value);
+  }
+
+  test::TempDir app;
+  ScriptedUi ui;
+  MemorySettings store;
+  ConversionState state;
+};
+
+TEST_F(CoordDialogsTest, ConversionDialogBindsTheFormAndFocusesTheRefusedList) {
+  MemorySettings empty;
+  CoordinateConversionDialog d(ui, app.path(), state, empty, ConversionDialogs{});
+  d.load();
+  for (const char* side : {"In", "Out"}) {
+    for (const char* list : {"CS", "Zone", "HDatum", "HUnits", "VDatum", "VUnits"})
+      Child<QComboBox>(&d, (std::string("cmbConvertF") + list + side).c_str());
+  }
+  for (const char* name :
+       {"chkConvertFScaleFactor", "chkConvertFConvAngle", "chkConvertFLatLong", "chkConvertFGeoid",
+        "cmdConvertFOK", "cmdConvertFCancel", "cmdConvertFEdit", "optConvertFZones",
+        "optConvertFDatums", "optConvertFEllipsoids"})
+    Child<QAbstractButton>(&d, name);
+  EXPECT_EQ(Items(Child<QComboBox>(&d, "cmbConvertFCSIn")).last(), "Geographic Coordinates");
+  EXPECT_FALSE(Child<QCheckBox>(&d, "chkConvertFGeoid")->isEnabled());
+  EXPECT_FALSE(Child<QComboBox>(&d, "cmbConvertFGeoid")->isEnabled());
+
+  Select(&d, "cmbConvertFCSIn", "State Plane 1983");
+  Select(&d, "cmbConvertFZoneIn", "Alabama West 0102");
+  EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFHDatumIn")->currentText(), "NAD 83");
+  EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFVUnitsIn")->currentText(), "Meters");
+  EXPECT_TRUE(Child<QCheckBox>(&d, "chkConvertFGeoid")->isEnabled());
+  Select(&d, "cmbConvertFCSIn", "Geographic Coordinates");
+  EXPECT_FALSE(Child<QComboBox>(&d, "cmbConvertFZoneIn")->isEnabled());
+  EXPECT_EQ(Items(Child<QComboBox>(&d, "cmbConvertFHUnitsIn")),
+            (QStringList{"DDD MM SS.ssss", "DDD.MMSSssss", "DDD.dddddd", "DDD MM.mmmm"}));
+  Select(&d, "cmbConvertFVDatumIn", "None");
+  EXPECT_FALSE(Child<QComboBox>(&d, "cmbConvertFVDatumOut")->isEnabled());
+
+  Click(&d, "cmdConvertFOK");
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(Box(ui.boxes[0]),
+            "Horizontal Datum Requied: You must specify the input Horizonal Datum.");
+  EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
+  EXPECT_EQ(d.focusWidget(), Child<QComboBox>(&d, "cmbConvertFHDatumIn"));
+  EXPECT_EQ(d.result(), QDialog::Rejected);
+  EXPECT_EQ(empty.get(kConversionSection, "Input Coordinate System", "<none>"), "<none>");
+}
+
+TEST_F(CoordDialogsTest, EditParametersAsksFirstAndNamesTheMissingEditor) {
+  CoordinateConversionDialog d(ui, app.path(), state, store, ConversionDialogs{});
+  d.load();
+  const std::string question =
+      "Edit Parameters?: Changing any of the values on the following dialog can result in "
+      "incorrect coordinate values. Are you sure you want to proceed?";
+  struct Case {
+    const char* option;
+    Answer answer;
+    std::string note;  // empty: nothing follows the question
+  };
+  const Case cases[] = {
+      {"optConvertFDatums", Answer::Ok,
+       "Edit Parameters: The datum editor is not available in this version."},
+      {"optConvertFEllipsoids", Answer::Ok,
+       "Edit Parameters: The ellipsoid editor is not available in this version."},
+      {"optConvertFZones", Answer::Cancel, ""},
+  };
+  for (const Case& c : cases) {
+    ui.boxes.clear();
+    ui.answers = {c.answer};
+    Click(&d, c.option);
+    Click(&d, "cmdConvertFEdit");
+    ASSERT_EQ(ui.boxes.size(), c.note.empty() ? 1u : 2u) << c.option;
+    EXPECT_EQ(Box(ui.boxes[0]), question);
+    EXPECT_EQ(ui.boxes[0].buttons, Buttons::OkCancel);
+    if (!c.note.empty()) {
+      EXPECT_EQ(Box(ui.boxes[1]), c.note);
+      EXPECT_EQ(ui.boxes[1].icon, Icon::Information);
+    }
+  }
+  // With an editor the lists are filled afresh, the choices kept.
+  std::vector<CatalogKind> opened;
+  d.setCatalogEditor([&](CatalogKind kind) { opened.push_back(kind); });
+  ui.boxes.clear();
+  ui.answers = {Answer::Ok};
+  Click(&d, "cmdConvertFEdit");
+  EXPECT_EQ(opened, std::vector<CatalogKind>{CatalogKind::Zones});
+  EXPECT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFZoneOut")->currentText(), "Alabama East 0101");
+}
+
+TEST_F(CoordDialogsTest, AListThatCannotBeFilledShowsTheErrorAndItsFunction) {
+  app.write("datums.ini", "[NAD 83]\r\nType=Horizontal\r\nShow In=x\r\n");
+  CoordinateConversionDialog d(ui, app.path(), state, store, ConversionDialogs{});
+  d.load();
+  ASSERT_EQ(ui.boxes.size(), 1u);
+  EXPECT_EQ(ui.boxes[0].text, "Error: Type mismatch\r\nFunction: modMisc.LoadDatumList");
+  EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFCSIn")->currentText(), "Geographic Coordinates");
+}
+
+TEST_F(CoordDialogsTest, AFileRunClosesTheDialogOnceConvertedAndRemembersTheChoice) {
+  state.points.resize(2);
+  state.points[0].Latitude = 0.57;
+  state.points[0].Longitude = 1.50;
+  CoordinateConversionDialog d(ui, app.path(), state, store, ConversionDialogs{});
+  d.load();
+  Click(&d, "chkConvertFScaleFactor");
+  Click(&d, "cmdConvertFOK");
+  EXPECT_TRUE(ui.boxes.empty()) << Box(ui.boxes[0]);
+  EXPECT_EQ(d.result(), QDialog::Accepted);
+  EXPECT_TRUE(state.accepted);
+  EXPECT_NE(state.points[0].Northing, kNoValue);
+  EXPECT_EQ(state.points[1].Northing, kNoValue);  // no position, nothing projected
+  EXPECT_EQ(store.get(kConversionSection, "Scale Factor", ""), "1");
+}
+
+TEST_F(CoordDialogsTest, ManualEntryChecksEachFieldAndPutsTheFocusBack) {
+  const ManualEntrySetup geo{true, true, "Meters", "Ellipsoid", "DDD MM SS.ssss", ""};
+  const ManualEntrySetup plane{false, true, "Meters", "Orthometric", "", "Meters"};
+  struct Case {
+    const ManualEntrySetup& setup;
+    std::map<const char*, QString> typed;
+    std::string box;    // empty: accepted
+    const char* focus;  // the field the box sends the user back to
+  };
+  const Case cases[] = {
+      {geo,
+       {{"txtManualLatitude", "45 3O"}},
+       "Invalid Latitude: Latitude must be a numeric value.",
+       "txtManualLatitude"},
+      {geo,
+       {{"txtManualLatitude", "45 30 00"},
+        {"txtManualLongitude", "93 00 00"},
+        {"txtManualGeoHeight", "1O"}},
+       "Invalid Height: Height must be a numeric value.",
+       "txtManualGeoHeight"},
+      {geo,
+       {{"txtManualLatitude", "45 30 00"}, {"txtManualLongitude", "93 61 00"}},
+       "Invalid Angle: Invalid Angle '93 61 00'. Minutes portion must be positive and not exceed "
+       "59.",
+       "txtManualLongitude"},
+      {geo,
+       {{"txtManualGeoName", "CP1"},
+        {"txtManualLatitude", "45 30 00"},
+        {"txtManualLongitude", "93 00 00"},
+        {"txtManualGeoHeight", "10"}},
+       "",
+       nullptr},
+      {plane,
+       {{"txtManualEasting", "2000"}},
+       "Northing Required: You must enter a Northing.",
+       "txtManualNorthing"},
+      {plane, {{"txtManualNorthing", "1000"}, {"txtManualEasting", "2000"}}, "", nullptr},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.box);
+    ui.boxes.clear();
+    SurveyPoint point;
+    ManualEntryDialog d(ui, c.setup, point);
+    EXPECT_EQ(Child<QWidget>(&d, "fraManualGeographic")->isVisibleTo(&d), c.setup.geographic);
+    EXPECT_EQ(Child<QWidget>(&d, "fraManualPlane")->isVisibleTo(&d), !c.setup.geographic);
+    EXPECT_EQ(Child<QComboBox>(&d, "cmbManualLatitudeDir")->currentText(), "N");
+    EXPECT_EQ(Child<QComboBox>(&d, "cmbManualLongitudeDir")->currentText(), "W");
+    for (const auto& [name, text] : c.typed) Child<QLineEdit>(&d, name)->setText(text);
+    Click(&d, "cmdManualOK");
+    if (c.box.empty()) {
+      EXPECT_TRUE(ui.boxes.empty()) << Box(ui.boxes[0]);
+      EXPECT_EQ(d.result(), QDialog::Accepted);
+      continue;
+    }
+    ASSERT_EQ(ui.boxes.size(), 1u);
+    EXPECT_EQ(Box(ui.boxes[0]), c.box);
+    EXPECT_EQ(d.result(), QDialog::Rejected);
+    EXPECT_EQ(d.focusWidget(), Child<QWidget>(&d, c.focus));
+  }
+}
+
+// SinglePoint through the engine's dialogs, as a user answers them.
+TEST_F(CoordDialogsTest, ATypedPointEndsInTheResultsWindowWithTheDriversReport) {
+  AppContext ctx(ui, app.path());
+  ctx.settings = &store;
+  QtEngineDialogs dialogs(ui);
+  state.singlePoint = true;
+  state.points.assign(1, SurveyPoint{});
+  OnModal("frmCoordinateConversion", [](QWidget* w) { Click(w, "cmdConvertFOK"); });
+  OnModal("frmManualCoordEntry", [](QWidget* w) {
+    Child<QLineEdit>(w, "txtManualGeoName")->setText("P1");
+    Child<QLineEdit>(w, "txtManualLatitude")->setText("32 30 00");
+    Child<QLineEdit>(w, "txtManualLongitude")->setText("86 00 00");
+    Child<QLineEdit>(w, "txtManualGeoHeight")->setText("100");
+    Click(w, "cmdManualOK");
+  });
+  QString shown;
+  OnModal("frmCoordinateResults", [&shown](QWidget* w) {
+    shown = Child<QPlainTextEdit>(w, "txtCoordResults")->toPlainText();
+    Click(w, "cmdCoordResultsOK");
+  });
+  EXPECT_TRUE(dialogs.coordinateConversion(ctx, state, /*presetInput=*/false));
+  EXPECT_TRUE(ui.boxes.empty()) << Box(ui.boxes[0]);
+  EXPECT_NE(state.report.find("Point Name: P1"), std::string::npos);
+  EXPECT_NE(state.report.find("Convergence Angle: "), std::string::npos);
+  EXPECT_EQ(shown.toStdString(),
+            QString::fromStdString(state.report).replace("\r\n", "\n").toStdString());
+  EXPECT_EQ(store.get(kConversionSection, "Input Vertical Datum", ""), "NAVD 88");
+}
+
+TEST_F(CoordDialogsTest, ResultsKeepTheReportsColumnsOnScreenAndOnPaper) {
+  const std::string report = "Title\t\t03/04/2026\r\n\r\n     Zone: \t\t\tEast";
+  CoordinateResultsDialog d(report);
+  auto* text = Child<QPlainTextEdit>(&d, "txtCoordResults");
+  EXPECT_TRUE(text->isReadOnly());
+  EXPECT_TRUE(QFontInfo(text->font()).fixedPitch());
+  EXPECT_DOUBLE_EQ(text->tabStopDistance(),
+                   8 * QFontMetricsF(text->font()).horizontalAdvance(QChar(' ')));
+  EXPECT_EQ(text->toPlainText(), "Title\t\t03/04/2026\n\n     Zone: \t\t\tEast");
+  Child<QPushButton>(&d, "cmdCoordResultsPrint");
+
+  // One document, with as many pages as the lines need.
+  std::string tall;
+  for (int i = 0; i < 300; ++i) tall += "\r\n     Line: \t\t" + std::to_string(i);
+  const std::pair<std::string, int> cases[] = {{report, 1}, {tall, 0}};
+  for (const auto& [content, pages] : cases) {
+    CoordinateResultsDialog results(content);
+    QPrinter printer(QPrinter::HighResolution);
+    printer.setOutputFormat(QPrinter::PdfFormat);
+    printer.setOutputFileName(QString::fromStdString(app.file("results.pdf")));
+    ASSERT_TRUE(results.printTo(printer));
+    const QString pdf = QString::fromLatin1(ReadFile(app.file("results.pdf")));
+    EXPECT_TRUE(pdf.startsWith("%PDF-"));
+    const QRegularExpressionMatch count = QRegularExpression(R"(/Count (\d+))").match(pdf);
+    ASSERT_TRUE(count.hasMatch());
+    if (pages > 0) {
+      EXPECT_EQ(count.captured(1).toInt(), pages);
+    } else {
+      EXPECT_GT(count.captured(1).toInt(), 2);
+    }
+  }
+}
+
+}  // namespace
+}  // namespace zv
