@@ -84,10 +84,12 @@ class TranslateLogic {
   LocationGroup input, output, configuration;
   bool storeDefault = false;  // chkActionDefault; enabled with the configuration group
 
+  // The translation as the controls now describe it (paths made absolute).
+  RoutineCall makeCall() const;
+
  private:
   bool validate();
   void resetConfiguration();
-  RoutineCall makeCall() const;
 
   AppContext& ctx_;
   LongRunner runLong_;

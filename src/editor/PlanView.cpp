@@ -468,13 +468,29 @@ std::string PlanSourcePath(const std::string& editorPath) {
   return std::string(p);
 }
 
+namespace {
+
+PlanWindow::Records RecordsOf(const QString& extension) {
+  if (extension == "CTL") return PlanWindow::Records::Control;
+  if (extension == "PAC" || extension == "PRJ" || extension == "EDI" || extension == "CAL")
+    return PlanWindow::Records::Chains;
+  return PlanWindow::Records::None;
+}
+
+QString UpperSuffix(const std::string& path) {
+  return QFileInfo(QString::fromStdString(path)).suffix().toUpper();
+}
+
+}  // namespace
+
+bool HasPlanView(const std::string& path) {
+  return RecordsOf(UpperSuffix(PlanSourcePath(path))) != PlanWindow::Records::None;
+}
+
 QWidget* OpenPlanView(Ui& ui, const std::string& editorPath) {
   const std::string path = PlanSourcePath(editorPath);
-  const QString extension = QFileInfo(QString::fromStdString(path)).suffix().toUpper();
-  PlanWindow::Records records = PlanWindow::Records::None;
-  if (extension == "CTL") records = PlanWindow::Records::Control;
-  if (extension == "PAC" || extension == "PRJ" || extension == "EDI" || extension == "CAL")
-    records = PlanWindow::Records::Chains;
+  const QString extension = UpperSuffix(path);
+  const PlanWindow::Records records = RecordsOf(extension);
   const FileType* type = nullptr;
   for (const FileType& t : FileTypes())
     if (records != PlanWindow::Records::None && t.reader &&

@@ -123,6 +123,10 @@ class PlanWindow : public QMainWindow {
 // views removed).
 std::string PlanSourcePath(const std::string& editorPath);
 
+// True for the files a plan can be drawn of: control, points-and-chains and
+// project files (extensions in any letter case).
+bool HasPlanView(const std::string& path);
+
 // Reads the file with the reader of its extension and opens a plan window
 // on it, shown at once and deleted when closed; nullptr (the reader has
 // shown why) when the file cannot be read.

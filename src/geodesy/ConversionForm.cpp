@@ -148,15 +148,13 @@ void ConversionForm::chooseSystem(FormSide side) {
       list(other, FormField::CoordinateSystem).selected == kGeographicCoordinates;
   const bool input = side == FormSide::Input;
   FormList& zone = at(side, FormField::Zone);
+  Refill(zone, {});
+  zone.enabled = !geographic;
   if (geographic) {
-    Refill(zone, {});
-    zone.enabled = false;
     Refill(at(side, FormField::HorizontalUnits), AngleFormatNames());
     latLong_.enabled = false;
     if (otherGeographic) scaleFactor_.enabled = convergence_.enabled = false;
   } else {
-    zone.enabled = true;
-    Refill(zone, {});
     Refill(at(side, FormField::HorizontalUnits), LinearUnitNames());
     scaleFactor_.enabled = convergence_.enabled = true;
     if (!otherGeographic) latLong_.enabled = true;

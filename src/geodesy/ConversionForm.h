@@ -130,7 +130,7 @@ class ConversionForm {
   void followGeoid();
 
   std::string appFolder_;
-  FormList lists_[2][7];
+  FormList lists_[2][7];  // by side and field; the one geoid model list is the input's
   FormOption scaleFactor_, convergence_, latLong_, geoid_;
 };
 

@@ -289,9 +289,10 @@ TEST_F(BatchExchangeTest, ManualModeNeedsTheConversionWindow) {
   };
   ASSERT_TRUE(exchange(lines, window));
   const ConversionSettings& s = seen.settings;
-  EXPECT_EQ(s.inputCoordinateSystem + "|" + s.inputZone + "|" + s.inputHorizontalDatum + "|" +
-                s.inputVerticalDatum,
-            "UTM NAD 83|Zone 13N|NAD 83|NGVD 29");
+  // Geographic points are offered as such, in the packed format.
+  EXPECT_EQ(s.inputCoordinateSystem + "|" + s.inputZone + "|" + s.inputHorizontalUnits + "|" +
+                s.inputHorizontalDatum + "|" + s.inputVerticalDatum,
+            std::string(kGeographicCoordinates) + "||" + kFormatPacked + "|NAD 83|NGVD 29");
   ASSERT_EQ(seen.points.size(), 1u);
   const SurveyPoint& p = seen.points[0];
   EXPECT_NEAR(p.Latitude, (45 + 30 / 60.0 + 15 / 3600.0) * kDegreesToRadians, 1e-15);

@@ -195,6 +195,10 @@ TEST_F(ConversionFormTest, OptionsFollowBothSystemsInEitherOrder) {
 
 TEST_F(ConversionFormTest, InputVerticalDatumNoneHoldsTheVerticalOutputAndTheGeoid) {
   ConversionForm form = loaded({{"Geoid Heights", "1"}});
+  const ManualEntrySetup grid = form.manualEntrySetup();
+  EXPECT_EQ((V{grid.heightType, grid.horizontalUnits, grid.angleFormat}),
+            (V{"Orthometric", "Meters", ""}));
+  EXPECT_TRUE(grid.heightWanted && !grid.geographic);
   EXPECT_TRUE(form.geoid().enabled);
   EXPECT_TRUE(form.list(In, GeoidModel).enabled);
   form.setGeoid(false);
@@ -207,6 +211,7 @@ TEST_F(ConversionFormTest, InputVerticalDatumNoneHoldsTheVerticalOutputAndTheGeo
   EXPECT_FALSE(form.list(Out, VerticalUnits).enabled);
   EXPECT_FALSE(form.geoid().enabled);
   EXPECT_FALSE(form.list(In, GeoidModel).enabled);
+  EXPECT_FALSE(form.manualEntrySetup().heightWanted);
   // A new output system keeps the output vertical datum at "None".
   form.choose(Out, CoordinateSystem, kGeo);
   EXPECT_EQ(form.list(Out, VerticalDatum).selected, "None");
@@ -231,104 +236,76 @@ TEST_F(ConversionFormTest, InputVerticalDatumNoneHoldsTheVerticalOutputAndTheGeo
 // Each row spoils the valid choice; the first refusal names its list and,
 // unattended, the key to mend.
 TEST_F(ConversionFormTest, OkChecksRunInOrderAndNameTheField) {
-  struct Case {
-    std::map<std::string, std::string> changes;
-    std::string title, text, key;  // empty title: accepted
-  };
-  const std::string csIn = "You must specify the input Coordinate System.";
-  const Case cases[] = {
-      {{}, "", "", ""},
+  using Changes = std::map<std::string, std::string>;
+  // "title: text [key]" of the first refusal; empty when accepted.
+  const std::pair<Changes, std::string> cases[] = {
+      {{}, ""},
       {{{"Input Coordinate System", ""}},
-       "Coordinate System Required",
-       csIn,
-       "Input Coordinate System"},
+       "Coordinate System Required: You must specify the input Coordinate System. "
+       "[Input Coordinate System]"},
       {{{"Input Coordinate System", "Grid C"}},
-       "Coordinate System Required",
-       csIn,
-       "Input Coordinate System"},
-      {{{"Input Zone", ""}}, "Zone Required", "You must specify the input Zone.", "Input Zone"},
+       "Coordinate System Required: You must specify the input Coordinate System. "
+       "[Input Coordinate System]"},
+      {{{"Input Zone", ""}}, "Zone Required: You must specify the input Zone. [Input Zone]"},
       {{{"Input Zone", ""},
         {"Input Coordinate System", kGeo},
-        {"Input Horizontal Units", "DDD.dddddd"}},
-       "",
-       "",
+        {"Input Horizontal Units", kFormatDecimal}},
        ""},
       {{{"Input Horizontal Datum", "NGVD 29"}},
-       "Horizontal Datum Requied",
-       "You must specify the input Horizonal Datum.",
-       "Input Horizontal Datum"},
-      {{{"Input Horizontal Units", "DDD.dddddd"}},
-       "Horizontal Units Required",
-       "You must specify the input Horizontal Units.",
-       "Input Horizontal Units"},
+       "Horizontal Datum Requied: You must specify the input Horizonal Datum. "
+       "[Input Horizontal Datum]"},
+      {{{"Input Horizontal Units", kFormatDecimal}},
+       "Horizontal Units Required: You must specify the input Horizontal Units. "
+       "[Input Horizontal Units]"},
       {{{"Input Vertical Units", ""}},
-       "Vertical Units Required",
-       "You must specify the Vertical Units.",
-       "Input Vertical Units"},
+       "Vertical Units Required: You must specify the Vertical Units. [Input Vertical Units]"},
       {{{"Input Vertical Units", ""},
         {"Input Vertical Datum", "None"},
         {"Output Vertical Units", ""}},
-       "",
-       "",
        ""},
       {{{"Input Horizontal Units", ""}, {"Output Coordinate System", ""}},
-       "Horizontal Units Required",
-       "You must specify the input Horizontal Units.",
-       "Input Horizontal Units"},
+       "Horizontal Units Required: You must specify the input Horizontal Units. "
+       "[Input Horizontal Units]"},
       {{{"Output Coordinate System", ""}},
-       "Coordinate System Required",
-       "You must specify the output Coordinate System.",
-       "Output Coordinate System"},
+       "Coordinate System Required: You must specify the output Coordinate System. "
+       "[Output Coordinate System]"},
       {{{"Output Zone", "North"}},
-       "Zone Required",
-       "You must specify the output Zone.",
-       "Output Zone"},
+       "Zone Required: You must specify the output Zone. [Output Zone]"},
       {{{"Output Horizontal Datum", ""}},
-       "Horizontal Datum Requied",
-       "You must specify the output Horizonal Datum.",
-       "Output Horizontal Datum"},
+       "Horizontal Datum Requied: You must specify the output Horizonal Datum. "
+       "[Output Horizontal Datum]"},
       {{{"Output Horizontal Units", ""}},
-       "Horizontal Units Required",
-       "You must specify the output Horizontal Units.",
-       "Output Horizontal Units"},
+       "Horizontal Units Required: You must specify the output Horizontal Units. "
+       "[Output Horizontal Units]"},
       {{{"Output Vertical Datum", "NGVD 29"}},
-       "Vertical Datum Required",
-       "You must specify the output Vertical Datum.",
-       "Output Vertical Datum"},
+       "Vertical Datum Required: You must specify the output Vertical Datum. "
+       "[Output Vertical Datum]"},
       {{{"Output Vertical Units", ""}},
-       "Vertical Units Required",
-       "You must specify the output Vertical Units.",
-       "Output Vertical Units"},
+       "Vertical Units Required: You must specify the output Vertical Units. "
+       "[Output Vertical Units]"},
       {{{"Geoid Heights", "1"}, {"Geoid Model", "GEOID12"}},
-       "Geoid Model Required",
-       "You must specfiy the Geoid Model to use in order to Compute Geoid Heights.",
-       "Geoid Model"},
-      {{{"Geoid Heights", "1"}, {"Geoid Model", ""}, {"Input Vertical Datum", "None"}}, "", "", ""},
+       "Geoid Model Required: You must specfiy the Geoid Model to use in order to Compute Geoid "
+       "Heights. [Geoid Model]"},
+      {{{"Geoid Heights", "1"}, {"Geoid Model", ""}, {"Input Vertical Datum", "None"}}, ""},
   };
-  for (const Case& c : cases) {
+  for (const auto& [changes, expected] : cases) {
     std::string trace;
-    for (const auto& [key, value] : c.changes) trace += key + "=" + value + "; ";
+    for (const auto& [key, value] : changes) trace += key + "=" + value + "; ";
     SCOPED_TRACE(trace);
-    std::optional<FormRefusal> refusal = loaded(c.changes).validate();
+    std::optional<FormRefusal> r = loaded(changes).validate();
     ui.boxes.clear();
-    std::optional<ConversionSettings> settings =
-        SettingsFromStore(ui, app.path(), store(c.changes), nullptr, "'jobs.ini'");
-    if (c.title.empty()) {
-      EXPECT_FALSE(refusal) << refusal->text;
-      EXPECT_TRUE(settings);
-      EXPECT_TRUE(ui.boxes.empty());
-      continue;
-    }
-    ASSERT_TRUE(refusal);
-    EXPECT_EQ(refusal->title, c.title);
-    EXPECT_EQ(refusal->text, c.text);
-    EXPECT_EQ(ConversionKey(refusal->side, refusal->field), c.key);
-    EXPECT_FALSE(settings);
-    ASSERT_EQ(ui.boxes.size(), 1u);
-    EXPECT_EQ(ui.boxes[0].title, c.title);
+    const bool accepted =
+        SettingsFromStore(ui, app.path(), store(changes), nullptr, "'jobs.ini'").has_value();
+    const std::string key = r ? ConversionKey(r->side, r->field) : "";
+    EXPECT_EQ(r ? r->title + ": " + r->text + " [" + key + "]" : "", expected);
+    EXPECT_EQ(accepted, !r);
+    ASSERT_EQ(ui.boxes.size(), r ? 1u : 0u);
+    if (!r) continue;
+    // Unattended, the same box names the key to mend.
     EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-    EXPECT_EQ(ui.boxes[0].text, c.text + "\r\nKey \"" + c.key +
-                                    "\" of section \"Coordinate Conversion\" in " + "'jobs.ini'.");
+    EXPECT_EQ(ui.boxes[0].title + ": " + ui.boxes[0].text,
+              r->title + ": " + r->text + "\r\nKey \"" + key +
+                  "\" of section \"Coordinate Conversion\" in 'jobs.ini'.");
   }
 }
 
@@ -344,16 +321,13 @@ TEST_F(ConversionFormTest, RemembersEveryKeyAndLoadsItBack) {
   for (const auto& [key, value] : expected)
     EXPECT_EQ(remembered.get(kConversionSection, key, "<missing>"), value) << key;
 
+  // Loaded back, the form remembers the same again.
   ConversionForm again(app.path());
   again.load(remembered);
-  ConversionSettings a = form.settings(), b = again.settings();
-  EXPECT_EQ((V{b.inputZone, b.outputHorizontalUnits, b.outputVerticalUnits}),
-            (V{"East", "International Feet", "U.S. Survey Feet"}));
-  EXPECT_EQ(
-      std::tie(a.inputCoordinateSystem, a.inputHorizontalDatum, a.outputZone, a.outputVerticalDatum,
-               a.OutputScaleFactor, a.OutputConvergence, a.OutputLatLong, a.OutputGeoid),
-      std::tie(b.inputCoordinateSystem, b.inputHorizontalDatum, b.outputZone, b.outputVerticalDatum,
-               b.OutputScaleFactor, b.OutputConvergence, b.OutputLatLong, b.OutputGeoid));
+  MemorySettings second;
+  again.remember(second);
+  for (const auto& [key, value] : expected)
+    EXPECT_EQ(second.get(kConversionSection, key, "<missing>"), value) << key;
 }
 
 TEST_F(ConversionFormTest, APresetTakesThePlaceOfTheRememberedInputSide) {
@@ -417,33 +391,6 @@ TEST_F(ConversionFormTest, AListThatCannotBeFilledIsReportedWithItsFunction) {
     ASSERT_EQ(ui.boxes.size(), 1u);
     EXPECT_EQ(ui.boxes[0].text, c.text);
     EXPECT_EQ(ui.boxes[0].icon, Icon::Exclamation);
-  }
-}
-
-TEST_F(ConversionFormTest, ManualEntrySetupFollowsTheInputSide) {
-  struct Case {
-    std::map<std::string, std::string> changes;
-    bool geographic, heightWanted;
-    std::string heightType, angleFormat, horizontalUnits;
-  };
-  const Case cases[] = {
-      {{}, false, true, "Orthometric", "", "Meters"},
-      {{{"Input Vertical Datum", "None"}}, false, false, "Ellipsoid", "", "Meters"},
-      {{{"Input Coordinate System", kGeo},
-        {"Input Horizontal Units", "DDD MM.mmmm"},
-        {"Input Vertical Datum", "ITRF"}},
-       true,
-       true,
-       "Ellipsoid",
-       "DDD MM.mmmm",
-       ""},
-  };
-  for (const Case& c : cases) {
-    const ManualEntrySetup s = loaded(c.changes).manualEntrySetup();
-    EXPECT_EQ(std::tie(s.geographic, s.heightWanted, s.heightType, s.angleFormat, s.horizontalUnits,
-                       s.verticalUnits),
-              std::make_tuple(c.geographic, c.heightWanted, c.heightType, c.angleFormat,
-                              c.horizontalUnits, "Meters"));
   }
 }
 

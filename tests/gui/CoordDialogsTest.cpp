@@ -7,7 +7,8 @@
 #include <QApplication>
 #include <QCheckBox>
 #include <QComboBox>
-#include <QFontInfo>
+#include <QEventLoop>
+#include <QFontMetricsF>
 #include <QLineEdit>
 #include <QPlainTextEdit>
 #include <QPrinter>
@@ -15,10 +16,12 @@
 #include <QRadioButton>
 #include <QRegularExpression>
 #include <QTest>
+#include <QThread>
 #include <QTimer>
 #include <filesystem>
 #include <functional>
 #include <map>
+#include <memory>
 
 #include "app/AppContext.h"
 #include "app/dialogs/QtEngineDialogs.h"
@@ -188,15 +191,6 @@ TEST_F(CoordDialogsTest, EditParametersAsksFirstAndNamesTheMissingEditor) {
   EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFZoneOut")->currentText(), "Alabama East 0101");
 }
 
-TEST_F(CoordDialogsTest, AListThatCannotBeFilledShowsTheErrorAndItsFunction) {
-  app.write("datums.ini", "[NAD 83]\r\nType=Horizontal\r\nShow In=x\r\n");
-  CoordinateConversionDialog d(ui, app.path(), state, store, ConversionDialogs{});
-  d.load();
-  ASSERT_EQ(ui.boxes.size(), 1u);
-  EXPECT_EQ(ui.boxes[0].text, "Error: Type mismatch\r\nFunction: modMisc.LoadDatumList");
-  EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFCSIn")->currentText(), "Geographic Coordinates");
-}
-
 TEST_F(CoordDialogsTest, AFileRunClosesTheDialogOnceConvertedAndRemembersTheChoice) {
   state.points.resize(2);
   state.points[0].Latitude = 0.57;
@@ -303,12 +297,43 @@ TEST_F(CoordDialogsTest, ATypedPointEndsInTheResultsWindowWithTheDriversReport) 
   EXPECT_EQ(store.get(kConversionSection, "Input Vertical Datum", ""), "NAVD 88");
 }
 
+// A routine that runs on a worker thread gets its dialogs from the GUI thread.
+TEST_F(CoordDialogsTest, AWorkersDialogsAreShownByTheGuiThread) {
+  QtEngineDialogs dialogs(ui);
+  std::vector<QThread*> shownOn;
+  OnModal("frmManualCoordEntry", [&](QWidget* w) {
+    shownOn.push_back(w->thread());
+    Child<QLineEdit>(w, "txtManualNorthing")->setText("1000");
+    Child<QLineEdit>(w, "txtManualEasting")->setText("2000");
+    Click(w, "cmdManualOK");
+  });
+  OnModal("frmCoordinateResults", [&](QWidget* w) {
+    shownOn.push_back(w->thread());
+    Click(w, "cmdCoordResultsOK");
+  });
+  SurveyPoint point;
+  bool entered = false;
+  std::unique_ptr<QThread> worker(QThread::create([&] {
+    entered = dialogs.enterPoint(ManualEntrySetup{}, point);
+    dialogs.showReport("Report");
+  }));
+  QEventLoop loop;
+  QObject::connect(worker.get(), &QThread::finished, &loop, &QEventLoop::quit);
+  worker->start();
+  loop.exec();
+  EXPECT_TRUE(entered);
+  EXPECT_EQ(point.Easting, 2000);
+  EXPECT_EQ(shownOn, (std::vector<QThread*>{qApp->thread(), qApp->thread()}));
+}
+
 TEST_F(CoordDialogsTest, ResultsKeepTheReportsColumnsOnScreenAndOnPaper) {
   const std::string report = "Title\t\t03/04/2026\r\n\r\n     Zone: \t\t\tEast";
   CoordinateResultsDialog d(report);
   auto* text = Child<QPlainTextEdit>(&d, "txtCoordResults");
   EXPECT_TRUE(text->isReadOnly());
-  EXPECT_TRUE(QFontInfo(text->font()).fixedPitch());
+  const QFontMetricsF metrics(text->font());  // every character as wide as a blank
+  for (QChar c : QString("iW0.:"))
+    EXPECT_DOUBLE_EQ(metrics.horizontalAdvance(c), metrics.horizontalAdvance(' ')) << c.toLatin1();
   EXPECT_DOUBLE_EQ(text->tabStopDistance(),
                    8 * QFontMetricsF(text->font()).horizontalAdvance(QChar(' ')));
   EXPECT_EQ(text->toPlainText(), "Title\t\t03/04/2026\n\n     Zone: \t\t\tEast");

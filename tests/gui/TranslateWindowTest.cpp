@@ -66,6 +66,7 @@ class TranslateWindowTest : public ::testing::Test {
   std::string state() {
     std::string s;
     for (const char* name : {"cmbInputType", "cmbOutputType", "cmbAction"}) {
+      if (!s.empty()) s += " / ";
       const QComboBox* box = child<QComboBox>(name);
       for (int i = 0; i < box->count(); ++i) {
         const std::string item = box->itemText(i).toStdString();
@@ -73,8 +74,8 @@ class TranslateWindowTest : public ::testing::Test {
         s += std::string(i ? "," : "") + (i == box->currentIndex() ? "*" : "") +
              (ext == std::string::npos ? item : item.substr(ext + 3, 3));
       }
-      s += " /";
     }
+    s += " /";
     const std::pair<const char*, std::vector<const char*>> groups[] = {
         {" in", {"lblInputLocation", "txtInputLocation", "cmdInputBrowse"}},
         {" out", {"lblOutputLocation", "txtOutputLocation", "cmdOutputBrowse"}},
@@ -131,8 +132,11 @@ TEST_F(TranslateWindowTest, OkChecksWhatTheBoxesHoldThenRunsAndViews) {
 
   const std::string output = dir.file("out/job.pac");
   setText("txtOutputLocation", output);
+  // The output can be drawn once it exists.
+  EXPECT_FALSE(child<QPushButton>("cmdPlanView")->isEnabled());
   ui.boxes.clear();
   click("cmdTranslateOK");
+  EXPECT_TRUE(child<QPushButton>("cmdPlanView")->isEnabled());
   EXPECT_EQ(ui.onlyText(), "Conversion Complete.");
   EXPECT_NE(ReadFile(output).find("PN:CP2\r\nYY:1100.2500\r\n"), std::string::npos);
   EXPECT_EQ(ui.editors, std::vector<std::string>{"viewer: " + kPac + ": " + output});

@@ -13,6 +13,8 @@
 #include <QVBoxLayout>
 
 #include "app/AppContext.h"
+#include "editor/PlanView.h"
+#include "platform/TextIo.h"
 #include "platform/qt/BackgroundRun.h"
 
 namespace zv {
@@ -104,10 +106,13 @@ TranslateWindow::TranslateWindow(AppContext& ctx, QWidget* parent)
   actionGrid->addLayout(row, 2, 1, 1, 2);
   pageLayout->addStretch();
 
+  plan_ = MakeButton(this, "cmdPlanView", "&Plan View...");
+  plan_->setToolTip("Draws the output file: its points, names and chains.");
   ok_ = MakeButton(this, "cmdTranslateOK", "OK");
   ok_->setDefault(true);
   cancel_ = MakeButton(this, "cmdTranslateCancel", "Cancel");
   auto* buttons = new QHBoxLayout;
+  buttons->addWidget(plan_);
   buttons->addStretch();
   buttons->addWidget(ok_);
   buttons->addWidget(cancel_);
@@ -162,6 +167,8 @@ void TranslateWindow::bind() {
   onButton(configuration_.buttons[2], &TranslateLogic::editConfiguration);
   connect(ok_, &QPushButton::clicked, this, &TranslateWindow::translate);
   connect(cancel_, &QPushButton::clicked, this, &TranslateWindow::cancel);
+  connect(plan_, &QPushButton::clicked, this,
+          [this] { OpenPlanView(ctx_.ui, logic_.makeCall().outputPath); });
 }
 
 void TranslateWindow::sync() {
@@ -180,6 +187,9 @@ void TranslateWindow::sync() {
   showGroup(output_, logic_.output);
   showGroup(configuration_, logic_.configuration);
   default_->setChecked(logic_.storeDefault);
+  // A tagged output that exists (the one just written) can be drawn.
+  const std::string output = logic_.output.enabled ? logic_.makeCall().outputPath : "";
+  plan_->setEnabled(!output.empty() && HasPlanView(output) && FileExists(output));
   syncing_ = false;
 }
 

@@ -57,6 +57,7 @@ class TranslateWindow : public QDialog {
   QComboBox* action_;
   Group input_, output_, configuration_;
   QCheckBox* default_;
+  QPushButton* plan_;
   QPushButton* ok_;
   QPushButton* cancel_;
   bool syncing_ = false;
