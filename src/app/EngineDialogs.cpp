@@ -12,7 +12,9 @@ bool ConsoleDialogs::coordinateConversion(AppContext& ctx, ConversionState& stat
   return false;
 }
 
-bool ConsoleDialogs::enterPoint(const ManualEntrySetup&, SurveyPoint&) { return false; }
+bool ConsoleDialogs::enterPoint(const ManualEntrySetup&, SurveyPoint&) {
+  return false;
+}
 
 void ConsoleDialogs::showReport(const std::string& report) {
   std::string text = report;

@@ -444,8 +444,7 @@ void TextEditorWindow::updateStatus() {
   columnLabel_->setText("Column Number: " + QString::number(c.positionInBlock() + 1));
 }
 
-QWidget* OpenTextEditor(Ui& ui, const std::string& path, const std::string& type,
-                        EditorMode mode) {
+QWidget* OpenTextEditor(Ui& ui, const std::string& path, const std::string& type, EditorMode mode) {
   auto* editor = new TextEditorWindow(ui);
   editor->setAttribute(Qt::WA_DeleteOnClose);
   // Shown first: a long file then fills a visible window behind its progress.

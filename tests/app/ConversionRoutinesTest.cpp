@@ -50,8 +50,8 @@ class ConversionRoutinesTest : public ::testing::Test {
     test::InstallCatalogs(dir.path());
     ctx.dialogs = &dialogs;
   }
-  bool runWindow(const std::string& program, const std::string& inType,
-                 const std::string& outType, const std::string& out) {
+  bool runWindow(const std::string& program, const std::string& inType, const std::string& outType,
+                 const std::string& out) {
     WindowRun run{ctx, {input, out, "", inType, outType, "Reproject"}, false, {}, {}};
     return FindWindowRoutine(program)->run(run);
   }
@@ -61,8 +61,8 @@ class ConversionRoutinesTest : public ::testing::Test {
   AppContext ctx;
   std::string input = dir.write(
       "job.ctl", CrLf({"PR:Job 7", "AC:PR", "CS:State Plane 1983", "ZN:Wisconsin Central 4802",
-                       "HD:NAD 83", "VD:NAVD 88", "UL:F", "AC:OS", "PN:CP100",
-                       "YC:247795.6047", "XC:2072520.8575", "ZC:1102.3400"}));
+                       "HD:NAD 83", "VD:NAVD 88", "UL:F", "AC:OS", "PN:CP100", "YC:247795.6047",
+                       "XC:2072520.8575", "ZC:1102.3400"}));
 };
 
 TEST_F(ConversionRoutinesTest, MultiPointWritesEveryReprojectionTypeAndRefusesTheOthers) {
@@ -132,9 +132,9 @@ TEST_F(ConversionRoutinesTest, ManualBatchModeOffersTheRequestAsTheInputSide) {
     dialogs.calls.clear();
     dialogs.accept = c.accept;
     // Line 3 differs from "Automatic" in letter case only: the manual mode.
-    dir.write("tccin.tmp", CrLf({"Caller", "1", "automatic", c.plane, "State Plane 1983",
-                                 "Wisconsin Central 4802", "83", "88", "F", "F", "Orthometric",
-                                 "", c.point}));
+    dir.write("tccin.tmp",
+              CrLf({"Caller", "1", "automatic", c.plane, "State Plane 1983",
+                    "Wisconsin Central 4802", "83", "88", "F", "F", "Orthometric", "", c.point}));
     EXPECT_EQ(Translate(ctx, {"", "tccin.tmp", "tccout.tmp", ""}), c.accept);
     EXPECT_EQ(dialogs.calls, std::vector<std::string>{c.call});
     const std::string answer = ReadFile(dir.file("tccout.tmp"));

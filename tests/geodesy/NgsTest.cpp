@@ -1,23 +1,16 @@
-// The NGS programs: grid files and interpolation against values worked by
-// hand, the files written for the programs (seen by small scripts standing
-// in their place), the reading of their output, the clean-up, and the
-// stand-in programs of the build on synthetic grids.
+// Running the NGS programs: the files written for them (seen by small
+// scripts standing in their place), the reading of their output, the
+// failures and the clean-up.
 
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
 #include <algorithm>
-#include <cmath>
-#include <cstring>
 #include <filesystem>
-#include <sstream>
 
 #include "geodesy/Angles.h"
 #include "geodesy/NgsPrograms.h"
-#include "geodesy/NgsTestSupport.h"
-#include "ngs/NgsGrids.h"
 #include "platform/ScriptedUi.h"
-#include "platform/TextIo.h"
 #include "support/Boxes.h"
 #include "support/TempDir.h"
 
@@ -26,85 +19,10 @@ namespace {
 
 namespace fs = std::filesystem;
 using test::CrLf;
-using test::MakeGeoidGrid;
-using test::MakeShiftGrid;
 using test::ReadFile;
 using V = std::vector<std::string>;
 
 constexpr double kDeg = kDegreesToRadians;
-
-template <typename T>
-T At(const std::string& bytes, size_t offset) {
-  T v;
-  std::memcpy(&v, bytes.data() + offset, 4);
-  return v;
-}
-
-TEST(NgsGrids, ShiftGridFileHasFortranRecordsOfOneRowEach) {
-  const ShiftGrid g =
-      MakeShiftGrid(-131.0, 20.0, 0.25, 30, 4, [](double x, double y) { return x + 1000 * y; });
-  std::ostringstream out;
-  WriteShiftGrid(out, g);
-  const std::string bytes = out.str();
-  const size_t record = 4 * 31;
-  ASSERT_EQ(bytes.size(), record * 5);
-  EXPECT_EQ(bytes.substr(0, 23), "NADCON EXTRACTED REGION");
-  EXPECT_EQ(bytes.substr(56, 8), "NADGRD  ");
-  EXPECT_EQ(std::tuple(At<int32_t>(bytes, 64), At<int32_t>(bytes, 68), At<int32_t>(bytes, 72)),
-            std::tuple(30, 4, 1));
-  EXPECT_EQ(std::tuple(At<float>(bytes, 76), At<float>(bytes, 80), At<float>(bytes, 84)),
-            std::tuple(-131.0f, 0.25f, 20.0f));
-  // Row 2 (second from the south), column 3: after the row's leading int32.
-  EXPECT_EQ(At<float>(bytes, 2 * record + 4 + 4 * 2), static_cast<float>(-130.5 + 20250.0));
-  std::istringstream cut(bytes.substr(0, bytes.size() - 10));
-  ShiftGrid back;
-  std::string error;
-  EXPECT_FALSE(ReadShiftGrid(cut, back, error));
-  EXPECT_EQ(error, "the file ends in row 4 of 4");
-  std::istringstream junk(std::string(60, 'x'));
-  GeoidGrid geoid;
-  EXPECT_FALSE(ReadGeoidGrid(junk, geoid, error));
-  EXPECT_EQ(error, "the header does not mark 4-byte real values");
-}
-
-TEST(NgsGrids, Interpolation) {
-  // South row 0 1 2, middle row 10 20 30, north row 5 5 5.
-  const float rows[3][3] = {{0, 1, 2}, {10, 20, 30}, {5, 5, 5}};
-  ShiftGrid g = MakeShiftGrid(-100, 40, 1, 3, 3, [&](double x, double y) {
-    return rows[static_cast<int>(y - 40)][static_cast<int>(x + 100)];
-  });
-  // Cell SW 0, NW 10, SE 1, NE 20 at dx 0.25, dy 0.5:
-  // 0 + 1 * 0.25 + 10 * 0.5 + (20 - 1 - 10 + 0) * 0.125 = 6.375.
-  EXPECT_DOUBLE_EQ(*InterpolateBilinear(g, -99.75, 40.5), 6.375);
-  for (auto [x, y] : {std::pair{-100.0, 40.5}, {-98.0, 40.5}, {-99.5, 42.0}, {-99.5, 39.99}})
-    EXPECT_FALSE(InterpolateBilinear(g, x, y)) << x << " " << y;  // on or outside the edge
-  g.values[4] = kVertconNoData;                                   // the middle node
-  EXPECT_FALSE(InterpolateBilinear(g, -99.75, 40.5, kVertconNoData));
-
-  // The 3 x 3 parabolas hold any product of quadratics in latitude and
-  // longitude; the natural splines hold any bilinear surface, also in the
-  // cells at the edge where the 6 x 6 window is shifted inward.
-  const auto quadratic = [](double lat, double lon) {
-    const double y = lat - 40, x = lon - 260;
-    return -28.0 + 3 * y - 2 * x + 5 * y * y - 4 * x * x + 6 * x * y + 2 * x * x * y * y;
-  };
-  const auto bilinear = [](double lat, double lon) {
-    return -28.0 + 3 * (lat - 40) - 2 * (lon - 260) + 6 * (lon - 260) * (lat - 40);
-  };
-  const GeoidGrid q = MakeGeoidGrid(40, 260, 0.25, 10, 12, quadratic);
-  const GeoidGrid b = MakeGeoidGrid(40, 260, 0.25, 10, 12, bilinear);
-  for (auto [lat, lon] : {std::pair{41.1, 261.3}, {40.05, 260.02}, {42.2, 262.7}, {41.0, 261.0}}) {
-    EXPECT_NEAR(InterpolateBiquadratic(q, lat, lon), quadratic(lat, lon), 1e-4) << lat;
-    EXPECT_NEAR(InterpolateSpline(b, lat, lon), bilinear(lat, lon), 1e-4) << lat;
-  }
-  // On a smooth surface of a real geoid's size, within a millimetre.
-  const auto smooth = [](double lat, double lon) {
-    return -30.0 + 8 * std::sin(lat * 0.7) * std::cos(lon * 0.9);
-  };
-  const GeoidGrid s = MakeGeoidGrid(40, 260, 1.0 / 60, 30, 30, smooth);
-  EXPECT_NEAR(InterpolateSpline(s, 40.2345, 260.3456), smooth(40.2345, 260.3456), 0.001);
-  EXPECT_NEAR(InterpolateBiquadratic(s, 40.2345, 260.3456), smooth(40.2345, 260.3456), 0.01);
-}
 
 SurveyPoint Point(const std::string& name, double latDeg, double lonDeg) {
   SurveyPoint p;
@@ -214,18 +132,6 @@ TEST_F(NgsRunTest, NadconMethodsPickTheAreaAndDirection) {
   }
   EXPECT_FALSE(Nadcon_Run(ui, app.path(), points, "NADCON Alabama HPGN to NAD 83 (1986)"));
   EXPECT_EQ(test::Take(ui), "E Unkown NADCON Conversion: Unkown NADCON Conversion.");
-
-  // Every NADCON method of the shipped datums.ini is known.
-  V lines;
-  ASSERT_TRUE(ReadTextLines(std::string(ZV_APP_DIR) + "/datums.ini", lines));
-  const auto& methods = NadconMethods();
-  for (const std::string& line : lines) {
-    const size_t eq = line.find("=NADCON");
-    if (eq == std::string::npos) continue;
-    EXPECT_TRUE(std::any_of(methods.begin(), methods.end(), [&](const NadconMethod& m) {
-      return m.name == line.substr(eq + 1);
-    })) << line;
-  }
 }
 
 TEST_F(NgsRunTest, FailuresNameTheProgramTheGridAndThePoint) {
@@ -304,79 +210,6 @@ TEST_F(NgsRunTest, GeoidModelsAndMethods) {
             "E Unknown Geoid Model: Unknown geoid model 'GEOID12'.\nE Aborting Datum "
             "Transformation: Can not perform vertical datum transformation 'GEOID09 WGS 84 to NAD "
             "83'.");
-}
-
-// The stand-in programs of the build on grids written here.
-class NgsStandInTest : public NgsRunTest {
- protected:
-  NgsStandInTest() { test::InstallAllStandIns(app.path()); }
-};
-
-TEST_F(NgsStandInTest, NadconShiftsByItsGridAndBackAndNamesWhatIsMissing) {
-  const std::string folder = app.file("NGS/NADCON");
-  std::vector<SurveyPoint> points{Point("P", 45.7626543, 111.1864197)};
-  EXPECT_FALSE(Nadcon_Run(ui, app.path(), points, "NADCON NAD 83 (1986) to Wisconsin HPGN"));
-  EXPECT_EQ(ui.onlyText(),
-            "NADCON wrote no output file '" + folder +
-                "/nadcon.out'.\r\n\r\nThe grid file 'wihpgn.las' was not found in '" + folder +
-                "'.");
-
-  // Shifts that vary across the grid, bilinear in each cell so that the
-  // interpolation is exact: las = 0.5 + 0.75 dx - 0.5 dy + 0.25 dx dy,
-  // los = 3 - 0.25 dx + dy arc seconds from (112 W, 44 N).
-  const auto las = [](double x, double y) {
-    return 0.5 + 0.75 * (x + 112) - 0.5 * (y - 44) + 0.25 * (x + 112) * (y - 44);
-  };
-  const auto los = [](double x, double y) { return 3.0 - 0.25 * (x + 112) + (y - 44); };
-  test::SaveShiftGrid(folder + "/conus.las", MakeShiftGrid(-112, 44, 0.25, 25, 17, las));
-  test::SaveShiftGrid(folder + "/conus.los", MakeShiftGrid(-112, 44, 0.25, 25, 17, los));
-  ASSERT_TRUE(Nadcon_Run(ui, app.path(), points, "NADCON NAD 27 to NAD 83")) << ui.onlyText();
-  EXPECT_NEAR(points[0].Latitude / kDeg, 45.7626543 + las(-111.1864197, 45.7626543) / 3600, 1e-9);
-  EXPECT_NEAR(points[0].Longitude / kDeg, 111.1864197 + los(-111.1864197, 45.7626543) / 3600, 1e-9);
-  ASSERT_TRUE(Nadcon_Run(ui, app.path(), points, "NADCON NAD 83 to NAD 27")) << ui.onlyText();
-  EXPECT_NEAR(points[0].Latitude / kDeg, 45.7626543, 2e-9);
-  EXPECT_NEAR(points[0].Longitude / kDeg, 111.1864197, 2e-9);
-  ui.boxes.clear();
-  points.push_back(Point("FAR", 10, 100));
-  EXPECT_FALSE(Nadcon_Run(ui, app.path(), points, "NADCON NAD 27 to NAD 83"));
-  EXPECT_EQ(ui.onlyText(),
-            "NADCON returned no result for point 'FAR'.\r\n\r\nPoint 'FAR' at "
-            "10.000000000 N, 100.000000000 W lies outside the NADCON grids in '" +
-                folder + "' (conus).");
-  EXPECT_EQ(FilesIn(folder), (V{"conus.las", "conus.los", "ndcon210"}));
-}
-
-TEST_F(NgsStandInTest, VertconAndGeoidFromTheirGrids) {
-  // VERTCON central grid in millimetres: 100 + 20 (lon + 107) - 10 (lat - 24).
-  test::SaveShiftGrid(app.file("NGS/VERTCON/vertconc.94"),
-                      MakeShiftGrid(-107, 24, 0.05, 461, 521, [](double x, double y) {
-                        return 100 + 20 * (x + 107) - 10 * (y - 24);
-                      }));
-  std::vector<SurveyPoint> points{Point("V", 36.176388889, 98.669444444), Point("W", 36.2, 120.0)};
-  points[0].Elevation = points[1].Elevation = 10.0;
-  EXPECT_FALSE(Vertcon_Run(ui, app.path(), points, true));
-  EXPECT_EQ(ui.onlyText(),
-            "VERTCON returned no result for point 'W'.\r\n\r\nPoint 'W' at 36.200000000 N, "
-            "120.000000000 W lies outside the VERTCON grids in '" +
-                app.file("NGS/VERTCON") + "' (vertconc.94; not found: vertconw.94, vertcone.94).");
-  const double mm = 100 + 20 * (107 - 98.669444444) - 10 * (36.176388889 - 24);
-  EXPECT_NEAR(points[0].Elevation, 10.0 + mm / 1000, 0.0005);  // 3 decimals in the output
-
-  // GEOID09: a bilinear surface, which the splines reproduce.
-  const auto n = [](double lat, double lon) {
-    return -30.0 + 0.5 * (lat - 40) - 0.25 * (lon - 255);
-  };
-  test::SaveGeoidGrid(app.file("NGS/GEOID/g2009u04.bin"),
-                      MakeGeoidGrid(40, 255, 1.0 / 60, 600, 600, n), true);
-  std::vector<SurveyPoint> g{Point("G", 48.071790872, 99.245864017)};
-  ui.boxes.clear();
-  ASSERT_TRUE(Geoid_Run(ui, app.path(), g, "GEOID09")) << ui.onlyText();
-  EXPECT_NEAR(g[0].GeoidHeight, n(48.071790872, 360 - 99.245864017), 0.0005);
-
-  EXPECT_FALSE(Geoid_Run(ui, app.path(), g, "GEOID03"));
-  EXPECT_EQ(ui.onlyText(), "GEOID wrote no output file '" + app.file("NGS/GEOID/geoid.out") +
-                               "'.\r\n\r\nNo GEOID03 grid files (g2003*.bin) were found in '" +
-                               app.file("NGS/GEOID") + "'.");
 }
 
 }  // namespace

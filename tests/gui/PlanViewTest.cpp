@@ -100,9 +100,9 @@ TEST(PlanModelTest, KeepsPointsWithPlanCoordinatesInTheFilesFrame) {
   const PlanRect b = g.bounds();
   EXPECT_EQ((std::vector{b.minX, b.minY, b.maxX, b.maxY}), (std::vector<double>{-5, 20, 10, 40}));
   EXPECT_FALSE(g.geographic());
-  EXPECT_EQ(g.unit(), "US ft");
-  EXPECT_EQ(PlanModel::Build(Header("X", "International Feet"), grid, {}).unit(), "ft");
-  EXPECT_EQ(PlanModel::Build(Header("X", ""), grid, {}).unit(), "");
+  EXPECT_EQ(g.unit() + "|" + PlanModel::Build(Header("X", "International Feet"), grid, {}).unit() +
+                "|" + PlanModel::Build(Header("X", ""), grid, {}).unit(),
+            "US ft|ft|");
 
   // Geographic: x is the east longitude and y the north latitude, in degrees.
   const struct {
@@ -113,10 +113,11 @@ TEST(PlanModelTest, KeepsPointsWithPlanCoordinatesInTheFilesFrame) {
              {Geo("W350", 1, "N", 350, "W"), 10, 1},
              {Geo("E270", 0, "N", 270, "E"), -90, 0}};
   for (const auto& c : geo) {
+    SCOPED_TRACE(c.point.PointName);
     PlanModel m = PlanModel::Build(Header(kGeographicCoordinates), {c.point}, {});
-    ASSERT_EQ(m.size(), 1u) << c.point.PointName;
-    EXPECT_NEAR(m.x(0), c.x, 1e-9) << c.point.PointName;
-    EXPECT_NEAR(m.y(0), c.y, 1e-9) << c.point.PointName;
+    ASSERT_EQ(m.size(), 1u);
+    EXPECT_NEAR(m.x(0), c.x, 1e-9);
+    EXPECT_NEAR(m.y(0), c.y, 1e-9);
     EXPECT_EQ(m.unit(), "deg");
   }
   // A grid point without latitude is not drawn in a geographic file.
@@ -258,9 +259,7 @@ TEST(PlanModelTest, TransformZoomsAboutThePointerAndFitsTheBounds) {
   for (const auto& f : fits) {
     PlanTransform v{0, 0, 1, 240, 120};
     v.fit(f.bounds, 10);
-    EXPECT_DOUBLE_EQ(v.scale, f.scale);
-    EXPECT_DOUBLE_EQ(v.centerX, f.cx);
-    EXPECT_DOUBLE_EQ(v.centerY, f.cy);
+    EXPECT_EQ((std::vector{v.scale, v.centerX, v.centerY}), (std::vector{f.scale, f.cx, f.cy}));
   }
 }
 
@@ -379,21 +378,12 @@ TEST_F(PlanViewTest, PointsAndTheirChainLandOnTheExpectedPixels) {
 }
 
 TEST_F(PlanViewTest, GeographicFilesHaveWestOnTheLeft) {
-  PlanModel m =
-      PlanModel::Build(Header(kGeographicCoordinates),
-                       {Geo("WEST", 45, "N", 90, "W"), Geo("EAST", 45, "N", 89, "W")}, {});
-  const QImage image = Draw(std::move(m), -89.5, 45, 100);
+  const QImage image =
+      Draw(PlanModel::Build(Header(kGeographicCoordinates),
+                            {Geo("W", 45, "N", 90, "W"), Geo("E", 45, "N", 89, "W")}, {}),
+           -89.5, 45, 100);
   EXPECT_EQ(image.pixel(50, 50), kPoint);   // 90 W
   EXPECT_EQ(image.pixel(150, 50), kPoint);  // 89 W
-  // Fitted, the western point is still on the left.
-  view.fitAll();
-  const PlanTransform t = view.transform();
-  auto screenX = [&](const char* name) {
-    for (std::uint32_t i = 0; i < view.model().size(); ++i)
-      if (view.model().name(i) == name) return t.screenX(view.model().x(i));
-    return -1.0;
-  };
-  EXPECT_LT(screenX("WEST"), screenX("EAST"));
 }
 
 TEST_F(PlanViewTest, ManyPointsInViewAreDrawnAsAMask) {
@@ -440,9 +430,7 @@ TEST_F(PlanViewTest, WheelZoomsAboutThePointerKeysPanAndFit) {
     EXPECT_NEAR((view.transform().centerY - before.centerY) * before.scale, k.dy, 1e-9) << k.key;
   }
   const double scale = view.transform().scale;
-  QTest::keyClick(&view, Qt::Key_Plus);
-  QTest::keyClick(&view, Qt::Key_Plus);
-  QTest::keyClick(&view, Qt::Key_Minus);
+  for (Qt::Key k : {Qt::Key_Plus, Qt::Key_Plus, Qt::Key_Minus}) QTest::keyClick(&view, k);
   EXPECT_NEAR(view.transform().scale, scale * 1.5, 1e-9);
   QTest::keyClick(&view, Qt::Key_F);
   EXPECT_NEAR(view.transform().centerX, 5, 1e-9);

@@ -74,8 +74,9 @@ TEST_F(ReprojectTest, ControlFileAgreesWithProjToTheMillimetre) {
       const PJ_XY p = toWisconsin(lon, lat);
       feet.push_back(p);
       char point[160];
-      std::snprintf(point, sizeof point, "AC:OS\r\nPN:P%zu\r\nYC:%.4f\r\nXC:%.4f\r\nZC:1000.0000\r\n",
-                    feet.size(), p.y, p.x);
+      std::snprintf(point, sizeof point,
+                    "AC:OS\r\nPN:P%zu\r\nYC:%.4f\r\nXC:%.4f\r\nZC:1000.0000\r\n", feet.size(), p.y,
+                    p.x);
       ctl += point;
     }
   }
@@ -106,8 +107,7 @@ TEST_F(ReprojectTest, ControlFileAgreesWithProjToTheMillimetre) {
 
 TEST_F(ReprojectTest, PointsAndChainsKeepTheirChainsAndRefusedSettingsNameTheirKey) {
   std::string err;
-  ASSERT_EQ(run("PACREPROJ|samples/sample.pac|utm.pac|TRNFiles/UTM16N-METRES.TRN", err), 0)
-      << err;
+  ASSERT_EQ(run("PACREPROJ|samples/sample.pac|utm.pac|TRNFiles/UTM16N-METRES.TRN", err), 0) << err;
   const std::string in = ReadFile(app.file("samples/sample.pac"));
   const std::string out = ReadFile(app.file("utm.pac"));
   const std::string chains = "AC:CH";

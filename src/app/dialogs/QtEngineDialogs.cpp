@@ -1,8 +1,5 @@
 #include "app/dialogs/QtEngineDialogs.h"
 
-#include <QApplication>
-#include <QCursor>
-
 #include "app/AppContext.h"
 #include "coordui/CoordinateConversionDialog.h"
 #include "coordui/CoordinateResultsDialog.h"
@@ -11,32 +8,6 @@
 #include "platform/qt/GuiThread.h"
 
 namespace zv {
-
-namespace {
-
-// While a dialog waits for the user: no busy window over it, the normal
-// pointer (the busy one comes back afterwards), and its owner.
-class UserWait {
- public:
-  UserWait() {
-    while (const QCursor* cursor = QApplication::overrideCursor()) {
-      cursors_.prepend(*cursor);
-      QApplication::restoreOverrideCursor();
-    }
-  }
-  ~UserWait() {
-    for (const QCursor& cursor : cursors_) QApplication::setOverrideCursor(cursor);
-  }
-  UserWait(const UserWait&) = delete;
-  UserWait& operator=(const UserWait&) = delete;
-  QWidget* owner() const { return pause_.owner(); }
-
- private:
-  BusyPause pause_;
-  QList<QCursor> cursors_;
-};
-
-}  // namespace
 
 bool QtEngineDialogs::coordinateConversion(AppContext& ctx, ConversionState& state,
                                            bool presetInput) {

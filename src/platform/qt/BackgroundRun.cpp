@@ -21,7 +21,8 @@ thread_local RunProgress* t_runProgress = nullptr;
 
 void SharedProgress::step(RunStage stage, std::uintmax_t done, std::uintmax_t total) {
   stage_ = static_cast<int>(stage);
-  permille_ = total == 0 ? 0 : static_cast<int>(std::min<std::uintmax_t>(done, total) * 1000 / total);
+  permille_ =
+      total == 0 ? 0 : static_cast<int>(std::min<std::uintmax_t>(done, total) * 1000 / total);
   if (stop_) throw RunCancelled{};
 }
 
@@ -104,6 +105,17 @@ BusyPause::BusyPause() {
 
 BusyPause::~BusyPause() {
   for (BusyProgress* busy : paused_) busy->resume();
+}
+
+UserWait::UserWait() {
+  while (const QCursor* cursor = QApplication::overrideCursor()) {
+    cursors_.prepend(*cursor);
+    QApplication::restoreOverrideCursor();
+  }
+}
+
+UserWait::~UserWait() {
+  for (const QCursor& cursor : cursors_) QApplication::setOverrideCursor(cursor);
 }
 
 bool RunInBackground(QWidget* owner, const QString& label, const std::function<bool()>& work) {

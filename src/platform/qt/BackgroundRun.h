@@ -2,6 +2,8 @@
 // Long work off the GUI thread: the windows keep painting, and a progress
 // window says that the work goes on when it takes longer than a moment.
 
+#include <QCursor>
+#include <QList>
 #include <QProgressDialog>
 #include <QString>
 #include <QTimer>
@@ -71,6 +73,22 @@ class BusyPause {
  private:
   QList<BusyProgress*> paused_;
   QWidget* owner_ = nullptr;
+};
+
+// While a window waits for the user (GUI thread only): no busy window over
+// it and the normal pointer; both come back afterwards. owner() is the
+// window it belongs to.
+class UserWait {
+ public:
+  UserWait();
+  ~UserWait();
+  UserWait(const UserWait&) = delete;
+  UserWait& operator=(const UserWait&) = delete;
+  QWidget* owner() const { return pause_.owner(); }
+
+ private:
+  BusyPause pause_;
+  QList<QCursor> cursors_;
 };
 
 // Runs `work` on a worker thread and returns its result once it has ended;

@@ -27,25 +27,6 @@ QString Text(const std::string& text) {
   return s;
 }
 
-// While a window waits for an answer: the normal pointer, and no busy
-// window over it.
-class WaitForUser {
- public:
-  explicit WaitForUser(bool busy) : busy_(busy) {
-    if (busy_) QApplication::restoreOverrideCursor();
-  }
-  ~WaitForUser() {
-    if (busy_) QApplication::setOverrideCursor(Qt::WaitCursor);
-  }
-  WaitForUser(const WaitForUser&) = delete;
-  WaitForUser& operator=(const WaitForUser&) = delete;
-  QWidget* owner() const { return busyPause_.owner(); }
-
- private:
-  bool busy_;
-  BusyPause busyPause_;
-};
-
 // A message box is as wide as its text; a short text would cut its title
 // ("Conversion Complete") in the title bar.
 void KeepTitleWhole(QMessageBox& box) {
@@ -93,7 +74,7 @@ QString FilterSuffix(const QString& nameFilter) {
 Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
                      const std::string& title) {
   return OnGuiThread([&] {
-    WaitForUser wait(busy_);
+    UserWait wait;
     QMessageBox box(wait.owner());
     box.setWindowTitle(Title(title));
     KeepTitleWhole(box);
@@ -154,7 +135,7 @@ Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
 std::optional<std::string> QtUi::input(const std::string& prompt, const std::string& title,
                                        const std::string& defaultText) {
   return OnGuiThread([&]() -> std::optional<std::string> {
-    WaitForUser wait(busy_);
+    UserWait wait;
     bool ok = false;
     QString answer =
         QInputDialog::getText(wait.owner(), Title(title), Text(prompt), QLineEdit::Normal,
@@ -166,7 +147,7 @@ std::optional<std::string> QtUi::input(const std::string& prompt, const std::str
 
 void QtUi::viewText(const std::string& path, const std::string& typeDescription) {
   OnGuiThread([&] {
-    WaitForUser wait(busy_);
+    UserWait wait;
     QPointer<QWidget> viewer =
         openEditor_ ? openEditor_(*this, path, typeDescription, EditorMode::Viewer) : nullptr;
     // Wait for the viewer to close while every window keeps working.
@@ -179,12 +160,13 @@ void QtUi::viewText(const std::string& path, const std::string& typeDescription)
 
 bool QtUi::openEditor(const std::string& path, const std::string& typeDescription,
                       EditorMode mode) {
-  return OnGuiThread([&] { return openEditor_ && openEditor_(*this, path, typeDescription, mode); });
+  return OnGuiThread(
+      [&] { return openEditor_ && openEditor_(*this, path, typeDescription, mode); });
 }
 
 std::optional<std::string> QtUi::chooseFile(const FileDialogRequest& request) {
   return OnGuiThread([&]() -> std::optional<std::string> {
-    WaitForUser wait(busy_);
+    UserWait wait;
     QFileDialog dialog(wait.owner(), QString::fromStdString(request.title),
                        QString::fromStdString(request.folder));
     dialog.setNameFilters(QtNameFilters(request.filter));
