@@ -98,7 +98,9 @@ TEST_F(ReprojectTest, ControlFileAgreesWithProjToTheMillimetre) {
     const SurveyPoint& p = work.InputPoints[i];
     const PJ_XY expected = toUtm(feet[i].x, feet[i].y);
     SCOPED_TRACE(p.PointName);
-    EXPECT_EQ(p.PointName, "P" + std::to_string(i + 1));
+    char name[24];
+    std::snprintf(name, sizeof name, "P%zu", i + 1);
+    EXPECT_EQ(p.PointName, name);
     EXPECT_NEAR(p.Northing, expected.y, 0.001);
     EXPECT_NEAR(p.Easting, expected.x, 0.001);
     EXPECT_NEAR(p.Elevation, 1000.0 * 1200.0 / 3937.0, 0.0001);
