@@ -6,10 +6,10 @@
 #include <vector>
 
 #include "geodesy/Angles.h"
+#include "geodesy/CatalogStore.h"
 #include "geodesy/Catalogs.h"
 #include "platform/Error.h"
 #include "platform/Numbers.h"
-#include "platform/Profile.h"
 #include "platform/Strings.h"
 #include "platform/TextIo.h"
 
@@ -210,21 +210,19 @@ bool ReadExchangeRequest(Ui& ui, std::istream& in, ExchangeRequest& request,
 
 std::string FindExchangeZone(const std::string& appFolder, const std::string& coordinateSystem,
                              const std::string& zone, const std::string& horizontalDatum) {
-  const std::string path = ZonesPath(appFolder);
-  const std::vector<std::string> sections = ReadProfileSections(path);
-  auto datumOf = [&](const std::string& section) {
-    return ReadProfileValue(path, section, "Horizontal Datum", "");
-  };
+  const auto zones = ZoneStore::In(appFolder).loadAll();
   if (!coordinateSystem.empty() && !zone.empty()) {
     const std::string wanted = coordinateSystem + "~" + zone;
-    auto same = [&](const std::string& s) { return EqualsNoCase(s, wanted); };
-    auto found = std::find_if(sections.begin(), sections.end(), same);
-    if (found != sections.end() && datumOf(*found) == horizontalDatum) return *found;
+    auto same = [&](const auto& z) { return EqualsNoCase(z.first, wanted); };
+    auto found = std::find_if(zones.begin(), zones.end(), same);
+    if (found != zones.end() && found->second.horizontalDatum == horizontalDatum) {
+      return found->first;
+    }
   }
   std::string fallback;
-  for (const std::string& section : sections) {
+  for (const auto& [section, record] : zones) {
     if (section.find(zone) == std::string::npos) continue;
-    const std::string datum = datumOf(section);
+    const std::string& datum = record.horizontalDatum;
     if (datum == horizontalDatum) return section;
     if (datum.find(horizontalDatum) == std::string::npos) continue;
     if (!fallback.empty()) return "";
@@ -336,8 +334,9 @@ bool BatchExchange(Ui& ui, const std::string& appFolder, ConversionState& state,
   const size_t tilde = section.find('~');
   s.inputCoordinateSystem = Trim(std::string_view(section).substr(0, tilde));
   s.inputZone = tilde == std::string::npos ? "" : Trim(std::string_view(section).substr(tilde + 1));
-  s.inputHorizontalDatum = ReadProfileValue(ZonesPath(appFolder), section, "Horizontal Datum", "");
-  const std::vector<std::string> datums = ReadProfileSections(DatumsPath(appFolder));
+  const std::optional<ZoneRecord> found = ZoneStore::In(appFolder).loadSection(section);
+  s.inputHorizontalDatum = found ? found->horizontalDatum : "";
+  const std::vector<std::string> datums = DatumStore::In(appFolder).sections();
   s.inputVerticalDatum =
       std::find(datums.begin(), datums.end(), request.verticalDatum) != datums.end()
           ? request.verticalDatum

@@ -4,9 +4,9 @@
 #include <cctype>
 
 #include "geodesy/Angles.h"
+#include "geodesy/CatalogStore.h"
 #include "platform/Error.h"
 #include "platform/Numbers.h"
-#include "platform/Profile.h"
 #include "platform/Strings.h"
 #include "platform/TextIo.h"
 
@@ -15,10 +15,10 @@ namespace zv {
 namespace {
 
 // A list flag ("Show", "Show In", "Show Out") read as a number.
-bool FlagIsOne(const std::string& value, const char* source) {
-  std::optional<double> v = ToNumber(value);
-  if (!v) throw ZvError(13, "Type mismatch", source);
-  return *v == 1;
+bool FlagIsOne(const CatalogFlag& flag, const char* source) {
+  std::optional<bool> one = flag.isOne();
+  if (!one) throw ZvError(13, "Type mismatch", source);
+  return *one;
 }
 
 constexpr const char* kResolveSource = "modMisc.ResolveZone";
@@ -45,95 +45,57 @@ std::vector<std::string> ProjectionNames() {
 }
 
 std::vector<std::string> LOAD_CS_ComboBoxList(const std::string& appFolder) {
-  std::vector<std::string> list;
-  for (const std::string& name : ReadProfileSections(ZonesPath(appFolder))) {
-    size_t tilde = name.find('~');
-    if (tilde == std::string::npos) {
-      throw ZvError(1, "Error loading coordinate systems.", "modMisc.LOAD_CS_ComboBoxList");
-    }
-    std::string system(Trim(std::string_view(name).substr(0, tilde)));
-    if (std::find(list.begin(), list.end(), system) == list.end()) list.push_back(system);
-  }
-  return list;
+  return ZoneStore::In(appFolder).coordinateSystems();
 }
 
 std::vector<std::string> LOAD_Zones_ComboBoxList(const std::string& appFolder, bool inputSide,
                                                  const std::string& coordinateSystem) {
-  static constexpr const char* kSource = "modMisc.LOAD_Zones_ComboBoxList";
-  const std::string path = ZonesPath(appFolder);
-  const ProfileSnapshot zones(path);
-  std::vector<std::string> list;
-  for (const std::string& name : ReadProfileSections(path)) {
-    size_t tilde = name.find('~');
-    if (tilde == std::string::npos) throw ZvError(1, "Error loading zones.", kSource);
-    if (Trim(std::string_view(name).substr(0, tilde)) != coordinateSystem) continue;
-    std::string flag = zones.value(name, inputSide ? "Show In" : "Show Out", "1");
-    if (FlagIsOne(flag, kSource)) list.emplace_back(Trim(std::string_view(name).substr(tilde + 1)));
-  }
-  return list;
+  return ZoneStore::In(appFolder).zones(coordinateSystem,
+                                        inputSide ? ZoneSide::Input : ZoneSide::Output);
 }
 
 std::vector<std::string> LoadDatumList(const std::string& appFolder, bool inputSide,
                                        bool horizontalList, bool geographic,
                                        bool threeDimensionalOnly) {
-  static constexpr const char* kSource = "modMisc.LoadDatumList";
-  const std::string path = DatumsPath(appFolder);
-  const ProfileSnapshot datums(path);
   std::vector<std::string> list;
-  for (const std::string& name : ReadProfileSections(path)) {
-    std::string type = datums.value(name, "Type", "");
-    std::string flag = datums.value(name, inputSide ? "Show In" : "Show Out", "");
-    if (!FlagIsOne(flag, kSource)) continue;
+  for (const DatumRecord& d : DatumStore::In(appFolder).loadAll()) {
+    if (!FlagIsOne(inputSide ? d.showIn : d.showOut, "modMisc.LoadDatumList")) continue;
     bool add;
     if (horizontalList) {
-      add = geographic ? type != "Vertical" : type == "Horizontal";
+      add = geographic ? d.type != "Vertical" : d.type == "Horizontal";
     } else if (!geographic) {
-      add = type == "Vertical";
+      add = d.type == "Vertical";
     } else {
-      add = threeDimensionalOnly ? type == "3D" : type != "Horizontal";
+      add = threeDimensionalOnly ? d.type == "3D" : d.type != "Horizontal";
     }
-    if (add) list.push_back(name);
+    if (add) list.push_back(d.name);
   }
   if (!horizontalList) list.insert(list.begin(), "None");
   return list;
 }
 
 std::vector<std::string> LoadEllipsoidList(const std::string& appFolder) {
-  const std::string path = EllipsoidsPath(appFolder);
-  const ProfileSnapshot ellipsoids(path);
   std::vector<std::string> list;
-  for (const std::string& name : ReadProfileSections(path)) {
-    if (FlagIsOne(ellipsoids.value(name, "Show", ""), "modEllipsoids.LoadEllipsoidList")) {
-      list.push_back(name);
-    }
+  for (const EllipsoidRecord& e : EllipsoidStore::In(appFolder).loadAll()) {
+    if (FlagIsOne(e.show, "modEllipsoids.LoadEllipsoidList")) list.push_back(e.name);
   }
   return list;
 }
 
 std::string FindZoneSection(const std::string& appFolder, const std::string& coordinateSystem,
                             const std::string& zone) {
-  for (const std::string& name : ReadProfileSections(ZonesPath(appFolder))) {
-    size_t tilde = name.find('~');
-    if (tilde == std::string::npos) continue;
-    std::string_view view(name);
-    if (EqualsNoCase(Trim(view.substr(0, tilde)), Trim(coordinateSystem)) &&
-        EqualsNoCase(Trim(view.substr(tilde + 1)), Trim(zone))) {
-      return name;
-    }
-  }
-  return {};
+  return ZoneStore::In(appFolder).findSection(coordinateSystem, zone);
 }
 
 ZoneDatumsAndUnits ReadZoneDatumsAndUnits(const std::string& appFolder,
                                           const std::string& coordinateSystem,
                                           const std::string& zone) {
   ZoneDatumsAndUnits out;
-  std::string section = FindZoneSection(appFolder, coordinateSystem, zone);
-  if (section.empty()) return out;
-  const ProfileSnapshot zones(ZonesPath(appFolder));
-  out.horizontalDatum = zones.value(section, "Horizontal Datum", "");
-  out.verticalDatum = zones.value(section, "Vertical Datum", "");
-  out.linearUnits = zones.value(section, "Linear Units", "");
+  if (auto z = ZoneStore::In(appFolder).load(coordinateSystem, zone)) {
+    out.horizontalDatum = z->horizontalDatum;
+    out.verticalDatum = z->verticalDatum;
+    out.linearUnits = z->linearUnits;
+  }
   return out;
 }
 
@@ -172,57 +134,36 @@ std::vector<std::pair<std::string, int>> LoadToolZoneList(const std::string& dir
 
 namespace {
 
+// The checks of one zone record, naming the section in their messages.
 class ZoneReader {
  public:
-  ZoneReader(Ui& ui, const std::string& path, std::string section)
-      : ui_(ui), zones_(path), section_(std::move(section)) {}
+  ZoneReader(Ui& ui, std::string section) : ui_(ui), section_(std::move(section)) {}
 
-  std::string text(const char* key) const { return zones_.value(section_, key, ""); }
-
-  std::string required(const char* key) const {
-    std::string value = text(key);
+  const std::string& required(const char* key, const std::string& value) const {
     if (value.empty()) ZoneError("Zone '" + section_ + "' has no " + key + ".");
     return value;
   }
 
-  double number(const char* key) const {
-    std::string value = required(key);
-    std::optional<double> v = ToNumber(value);
-    if (!v) ZoneError("Zone '" + section_ + "': the " + key + " '" + value + "' is not a number.");
+  double number(const char* key, const CatalogNumber& n) const {
+    required(key, n.text);
+    std::optional<double> v = n.value();
+    if (!v) ZoneError("Zone '" + section_ + "': the " + key + " '" + n.text + "' is not a number.");
     return *v;
   }
 
   // A packed "DDD.MMSSssss" angle in radians, in the zone's own direction.
-  double angle(const char* key) const {
-    std::string value = required(key);
-    double r = kNoValue;
-    try {
-      r = Angles_PackedToRadians(ui_, value);
-    } catch (const ZvError&) {
-      r = kNoValue;
-    }
-    if (r == kNoValue) {
-      ZoneError("Zone '" + section_ + "': the " + key + " '" + value + "' is not a valid angle.");
-    }
-    return r;
+  double angle(const char* key, const CatalogAngle& a) const {
+    required(key, a.text);
+    std::optional<double> r = a.radians(ui_);
+    if (!r)
+      ZoneError("Zone '" + section_ + "': the " + key + " '" + a.text + "' is not a valid angle.");
+    return *r;
   }
-
-  const std::string& section() const { return section_; }
 
  private:
   Ui& ui_;
-  ProfileSnapshot zones_;
   std::string section_;
 };
-
-bool UsesScaleFactor(const std::string& p) {
-  return p == kTransverseMercator || p == kLambertOneParallel || p == kTransverseMercatorNad27 ||
-         p == kObliqueMercator;
-}
-
-bool UsesParallels(const std::string& p) {
-  return p == kLambertTwoParallels || p == kLambertNad27;
-}
 
 bool IsNad27Form(const std::string& p) {
   return p == kTransverseMercatorNad27 || p == kLambertNad27;
@@ -232,80 +173,86 @@ bool IsNad27Form(const std::string& p) {
 
 ZoneParameters ResolveZone(Ui& ui, const std::string& appFolder,
                            const std::string& coordinateSystem, const std::string& zone) {
-  std::string section = FindZoneSection(appFolder, coordinateSystem, zone);
-  if (section.empty()) {
+  std::string section;
+  const std::optional<ZoneRecord> record =
+      ZoneStore::In(appFolder).load(coordinateSystem, zone, &section);
+  if (!record) {
     ZoneError("Zone '" + zone + "' of coordinate system '" + coordinateSystem +
               "' was not found in zones.ini.");
   }
-  ZoneReader z(ui, ZonesPath(appFolder), section);
+  const ZoneRecord& r = *record;
+  const ZoneReader z(ui, section);
   ZoneParameters p;
-  p.fullName = z.text("Full Name");
-  p.horizontalDatum = z.text("Horizontal Datum");
-  p.verticalDatum = z.text("Vertical Datum");
+  p.fullName = r.fullName;
+  p.horizontalDatum = r.horizontalDatum;
+  p.verticalDatum = r.verticalDatum;
 
-  p.projection = z.text("Projection");
-  std::vector<std::string> names = ProjectionNames();
-  if (std::find(names.begin(), names.end(), p.projection) == names.end()) {
+  p.projection = r.projection;
+  if (!IsKnownProjection(p.projection)) {
     ZoneError("Zone '" + section + "' has an unknown Projection '" + p.projection + "'.");
   }
 
   // The ellipsoid: the zone's own, or that of its horizontal datum.
-  p.ellipsoid = z.text("Computational Ellipsoid");
+  p.ellipsoid = r.computationalEllipsoid;
   if (p.ellipsoid.empty()) {
-    const ProfileSnapshot datums(DatumsPath(appFolder));
     if (p.horizontalDatum.empty()) ZoneError("Zone '" + section + "' has no Horizontal Datum.");
-    if (!datums.has(p.horizontalDatum)) {
+    const std::optional<DatumRecord> datum = DatumStore::In(appFolder).load(p.horizontalDatum);
+    if (!datum) {
       ZoneError("The Horizontal Datum '" + p.horizontalDatum + "' of zone '" + section +
                 "' was not found in datums.ini.");
     }
-    p.ellipsoid = datums.value(p.horizontalDatum, "Ellipsoid", "");
+    p.ellipsoid = datum->ellipsoid;
     if (p.ellipsoid.empty()) {
       ZoneError("The Horizontal Datum '" + p.horizontalDatum + "' of zone '" + section +
                 "' has no Ellipsoid.");
     }
   }
-  const ProfileSnapshot ellipsoids(EllipsoidsPath(appFolder));
-  if (!ellipsoids.has(p.ellipsoid)) {
+  const std::optional<EllipsoidRecord> ellipsoid = EllipsoidStore::In(appFolder).load(p.ellipsoid);
+  if (!ellipsoid) {
     ZoneError("The ellipsoid '" + p.ellipsoid + "' of zone '" + section +
               "' was not found in ellipsoids.ini.");
   }
-  auto ellipsoidValue = [&](const char* key) {
-    std::string value = ellipsoids.value(p.ellipsoid, key, "");
-    std::optional<double> v = ToNumber(value);
+  auto ellipsoidValue = [&](const char* key, const CatalogNumber& n) {
+    std::optional<double> v = n.value();
     if (!v) {
-      ZoneError("The ellipsoid '" + p.ellipsoid + "' has no valid " + key + " ('" + value + "').");
+      ZoneError("The ellipsoid '" + p.ellipsoid + "' has no valid " + key + " ('" + n.text + "').");
     }
     return *v;
   };
-  p.a = ellipsoidValue("Semimajor Axis");
-  p.e = ellipsoidValue("Eccentricity");
+  p.a = ellipsoidValue("Semimajor Axis", ellipsoid->semimajorAxis);
+  p.e = ellipsoidValue("Eccentricity", ellipsoid->eccentricity);
 
-  std::string latDir = z.text("Positive Latitude Direction");
-  std::string lonDir = z.text("Positive Longitude Direction");
+  const std::string& latDir = r.latitudeDirection;
+  const std::string& lonDir = r.longitudeDirection;
   if (latDir != "N" && latDir != "S") {
     ZoneError("Zone '" + section + "': the Positive Latitude Direction must be N or S.");
   }
   if (lonDir != "E" && lonDir != "W") {
     ZoneError("Zone '" + section + "': the Positive Longitude Direction must be E or W.");
   }
-  auto latitude = [&](const char* key) {
-    return Angles_ConvertHemisphere(z.angle(key), latDir, "N");
+  auto latitude = [&](const char* key, const CatalogAngle& a) {
+    return Angles_ConvertHemisphere(z.angle(key, a), latDir, "N");
   };
-  p.phi0 = latitude("Central Latitude");
-  p.lambda0 = Angles_ConvertHemisphere(z.angle("Central Longitude"), lonDir, "W");
+  p.phi0 = latitude("Central Latitude", r.centralLatitude);
+  p.lambda0 =
+      Angles_ConvertHemisphere(z.angle("Central Longitude", r.centralLongitude), lonDir, "W");
 
-  p.linearUnits = z.text("Linear Units");
+  p.linearUnits = r.linearUnits;
   if (Distances_Convert(1, p.linearUnits, kMeters) == kNoValue) {
     ZoneError("Zone '" + section + "' has unknown Linear Units '" + p.linearUnits + "'.");
   }
   const char* unit = IsNad27Form(p.projection) ? kUsSurveyFeet : kMeters;
-  p.falseNorthing = Distances_Convert(z.number("False Northing"), p.linearUnits, unit);
-  p.falseEasting = Distances_Convert(z.number("False Easting"), p.linearUnits, unit);
+  p.falseNorthing =
+      Distances_Convert(z.number("False Northing", r.falseNorthing), p.linearUnits, unit);
+  p.falseEasting =
+      Distances_Convert(z.number("False Easting", r.falseEasting), p.linearUnits, unit);
 
-  p.k0 = UsesScaleFactor(p.projection) ? z.number("Scale Factor") : kNoValue;
-  p.phiN = UsesParallels(p.projection) ? latitude("Northern Parallel") : kNoValue;
-  p.phiS = UsesParallels(p.projection) ? latitude("Southern Parallel") : kNoValue;
-  p.azimuth = p.projection == kObliqueMercator ? z.angle("Azimuth") : kNoValue;
+  const bool parallels = ProjectionUsesParallels(p.projection);
+  p.k0 =
+      ProjectionUsesScaleFactor(p.projection) ? z.number("Scale Factor", r.scaleFactor) : kNoValue;
+  p.phiN = parallels ? latitude("Northern Parallel", r.northernParallel) : kNoValue;
+  p.phiS = parallels ? latitude("Southern Parallel", r.southernParallel) : kNoValue;
+  p.azimuth = ProjectionUsesAzimuth(p.projection) ? z.angle("Azimuth", r.azimuth) : kNoValue;
   return p;
 }
 

@@ -4,12 +4,12 @@
 #include <cstdio>
 
 #include "geodesy/Angles.h"
+#include "geodesy/CatalogStore.h"
 #include "geodesy/Catalogs.h"
 #include "geodesy/NgsPrograms.h"
 #include "geodesy/Projection.h"
 #include "platform/Error.h"
 #include "platform/Numbers.h"
-#include "platform/Profile.h"
 #include "platform/Strings.h"
 
 namespace zv {
@@ -134,11 +134,14 @@ std::string FormatTime(const std::tm& t) {
 bool HorizontalDatumTransformation(Ui& ui, const std::string& appFolder,
                                    std::vector<SurveyPoint>& points, const std::string& from,
                                    const std::string& to) {
-  const std::string datums = DatumsPath(appFolder);
-  const std::string method = ReadProfileValue(datums, from, to, "");
+  const DatumStore datums = DatumStore::In(appFolder);
+  const std::string method = datums.method(from, to);
   if (method.empty()) {
-    if (ReadProfileValue(datums, from, "Ellipsoid", "") ==
-        ReadProfileValue(datums, to, "Ellipsoid", "")) {
+    auto ellipsoidOf = [&](const std::string& name) {
+      const std::optional<DatumRecord> datum = datums.load(name);
+      return datum ? datum->ellipsoid : std::string();
+    };
+    if (ellipsoidOf(from) == ellipsoidOf(to)) {
       return ui.askYesNo(
           "No datum transformation exists for '" + from + "' to '" + to +
               "' but these datums share the same ellipsoid.  The coordiantes can be converted "
@@ -157,7 +160,7 @@ bool HorizontalDatumTransformation(Ui& ui, const std::string& appFolder,
 bool VerticalDatumTransformation(Ui& ui, const std::string& appFolder,
                                  std::vector<SurveyPoint>& points, const std::string& from,
                                  const std::string& to) {
-  const std::string method = ReadProfileValue(DatumsPath(appFolder), from, to, "");
+  const std::string method = DatumStore::In(appFolder).method(from, to);
   if (method.empty()) {
     ui.exclaim("No datum transformation exists for '" + from + "' to '" + to + "'.",
                "No Datum Transformation");

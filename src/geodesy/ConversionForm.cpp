@@ -5,9 +5,9 @@
 #include <span>
 
 #include "geodesy/Angles.h"
+#include "geodesy/CatalogStore.h"
 #include "geodesy/Catalogs.h"
 #include "platform/Numbers.h"
-#include "platform/Profile.h"
 #include "platform/Strings.h"
 
 namespace zv {
@@ -281,8 +281,8 @@ ConversionSettings ConversionForm::settings() const {
 std::string ConversionForm::heightType() const {
   const std::string& datum = list(FormSide::Input, FormField::VerticalDatum).selected;
   if (datum.empty() || datum == kNone) return "Ellipsoid";
-  return ReadProfileValue(DatumsPath(appFolder_), datum, "Type", "") == "Vertical" ? "Orthometric"
-                                                                                   : "Ellipsoid";
+  const std::optional<DatumRecord> record = DatumStore::In(appFolder_).load(datum);
+  return record && record->type == "Vertical" ? "Orthometric" : "Ellipsoid";
 }
 
 ManualEntrySetup ConversionForm::manualEntrySetup() const {

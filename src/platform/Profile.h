@@ -1,37 +1,32 @@
 #pragma once
 // Profile (INI) files: sections of key=value lines. Section and key names
 // compare without regard to letter case; values are kept exactly. Every call
-// reads the file afresh; writes keep the file order, use CR LF and go through
-// a temporary file.
+// reads the file afresh (once); a write changes the lines it must, keeps every
+// other byte and goes through a temporary file (see ProfileDocument).
 
 #include <string>
 #include <string_view>
-#include <utility>
 #include <vector>
 
-namespace zv {
+#include "platform/ProfileDocument.h"
 
-inline constexpr size_t kProfileValueLimit = 25000;
-inline constexpr size_t kProfileSectionsLimit = 30000;
+namespace zv {
 
 // One read of a profile file for the many lookups of a single operation,
 // with the rules of ReadProfileValue.
 class ProfileSnapshot {
  public:
-  explicit ProfileSnapshot(const std::string& path);
-  bool has(std::string_view section) const;
+  explicit ProfileSnapshot(const std::string& path) : doc_(ProfileDocument::Load(path)) {}
+  bool has(std::string_view section) const { return doc_.has(section); }
   // The value (at most 25000 characters), or the default when the key is
   // missing or its value is empty.
   std::string value(std::string_view section, std::string_view key,
-                    const std::string& defaultValue) const;
+                    const std::string& defaultValue) const {
+    return doc_.value(section, key, defaultValue);
+  }
 
  private:
-  struct Section {
-    std::string name;
-    std::vector<std::pair<std::string, std::string>> keys;
-  };
-  const Section* find(std::string_view section) const;
-  std::vector<Section> sections_;
+  ProfileDocument doc_;
 };
 
 // The section names in file order (as the 30000-character NUL-separated

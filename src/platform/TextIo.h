@@ -86,6 +86,11 @@ class TextFileWriter {
     buf_ += "\r\n";
     if (buf_.size() >= kFlushAt) flush();
   }
+  // Bytes as they are, line ends included.
+  void raw(std::string_view bytes) {
+    buf_.append(bytes);
+    if (buf_.size() >= kFlushAt) flush();
+  }
   // A string being built in place; call lineDone() afterwards.
   std::string& buffer() { return buf_; }
   void lineDone() {

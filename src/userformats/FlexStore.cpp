@@ -4,6 +4,7 @@
 #include <cctype>
 
 #include "platform/Profile.h"
+#include "platform/ProfileDocument.h"
 #include "platform/Strings.h"
 
 namespace zv {
@@ -126,7 +127,7 @@ FlexStore FlexStore::Output(const std::string& appFolder) {
 }
 
 std::vector<std::string> FlexStore::listFormats() const {
-  return ReadProfileSections(path_);
+  return ProfileDocument::Load(path_).sectionNames();
 }
 
 bool FlexStore::checkFormat(Ui& ui, const std::string& name) const {
@@ -157,54 +158,70 @@ bool FlexStore::deleteFormat(const std::string& format) const {
 }
 
 FlexInFormat FlexStore::loadInput(const std::string& name) const {
+  const ProfileDocument doc = ProfileDocument::Load(path_);
+  auto value = [&](const char* key) { return doc.value(name, key, ""); };
   FlexInFormat f;
-  f.delimiter = readValue(name, "Delimiter");
-  f.coordinateType = readValue(name, "Coordinate Type");
-  f.columns = SplitList(readValue(name, "Columns"));
-  f.order = SplitList(readValue(name, "Column Order"));
-  f.headerPrefix = readValue(name, "Header");
-  f.ignorePrefix = readValue(name, "Ignore");
+  f.delimiter = value("Delimiter");
+  f.coordinateType = value("Coordinate Type");
+  f.columns = SplitList(value("Columns"));
+  f.order = SplitList(value("Column Order"));
+  f.headerPrefix = value("Header");
+  f.ignorePrefix = value("Ignore");
   return f;
 }
 
 FlexOutFormat FlexStore::loadOutput(const std::string& name) const {
+  const ProfileDocument doc = ProfileDocument::Load(path_);
+  auto value = [&](const char* key) { return doc.value(name, key, ""); };
   FlexOutFormat f;
-  f.delimiter = readValue(name, "Delimiter");
-  f.coordinateType = readValue(name, "Coordinate Type");
-  f.columns = SplitList(readValue(name, "Columns"));
-  f.order = SplitList(readValue(name, "Column Order"));
-  f.decimalPlaces = SplitList(readValue(name, "Decimal Places"));
+  f.delimiter = value("Delimiter");
+  f.coordinateType = value("Coordinate Type");
+  f.columns = SplitList(value("Columns"));
+  f.order = SplitList(value("Column Order"));
+  f.decimalPlaces = SplitList(value("Decimal Places"));
   // Anything but "1" (missing, "0" or not a number) leaves the header off.
-  f.writeHeader = readValue(name, "Write Header") == "1";
-  f.headerPrefix = readValue(name, "Header Prefix");
+  f.writeHeader = value("Write Header") == "1";
+  f.headerPrefix = value("Header Prefix");
   return f;
 }
 
-bool FlexStore::save(const std::string& name, const FlexInFormat& f) const {
+namespace {
+
+// One format section, written with one write of the file.
+bool SaveFormat(const std::string& path, const std::string& name, const ProfileKeys& keys) {
   if (!IsValidFormatName(name)) return false;
-  return writeValue(name, "Delimiter", f.delimiter) &&
-         writeValue(name, "Coordinate Type", f.coordinateType) &&
-         writeValue(name, "Columns", JoinList(f.columns)) &&
-         writeValue(name, "Column Order", JoinList(f.order)) &&
-         writeValue(name, "Header", f.headerPrefix) && writeValue(name, "Ignore", f.ignorePrefix);
+  std::vector<std::string> managed;
+  for (const auto& key : keys) managed.push_back(key.first);
+  ProfileDocument doc = ProfileDocument::Load(path);
+  doc.writeSection(name, keys, managed);
+  return doc.save(path);
+}
+
+}  // namespace
+
+bool FlexStore::save(const std::string& name, const FlexInFormat& f) const {
+  return SaveFormat(path_, name,
+                    {{"Delimiter", f.delimiter},
+                     {"Coordinate Type", f.coordinateType},
+                     {"Columns", JoinList(f.columns)},
+                     {"Column Order", JoinList(f.order)},
+                     {"Header", f.headerPrefix},
+                     {"Ignore", f.ignorePrefix}});
 }
 
 bool FlexStore::save(const std::string& name, const FlexOutFormat& f) const {
-  if (!IsValidFormatName(name)) return false;
-  return writeValue(name, "Delimiter", f.delimiter) &&
-         writeValue(name, "Coordinate Type", f.coordinateType) &&
-         writeValue(name, "Columns", JoinList(f.columns)) &&
-         writeValue(name, "Column Order", JoinList(f.order)) &&
-         writeValue(name, "Decimal Places", JoinList(f.decimalPlaces)) &&
-         writeValue(name, "Write Header", f.writeHeader ? "1" : "0") &&
-         writeValue(name, "Header Prefix", f.headerPrefix);
+  return SaveFormat(path_, name,
+                    {{"Delimiter", f.delimiter},
+                     {"Coordinate Type", f.coordinateType},
+                     {"Columns", JoinList(f.columns)},
+                     {"Column Order", JoinList(f.order)},
+                     {"Decimal Places", JoinList(f.decimalPlaces)},
+                     {"Write Header", f.writeHeader ? "1" : "0"},
+                     {"Header Prefix", f.headerPrefix}});
 }
 
 bool IsValidFormatName(std::string_view name) {
-  if (name.empty()) return false;
-  if (name.find_first_of("]\r\n") != std::string_view::npos) return false;
-  auto blank = [](char c) { return c == ' ' || c == '\t'; };
-  return !blank(name.front()) && !blank(name.back());
+  return IsValidSectionName(name);
 }
 
 }  // namespace zv

@@ -83,7 +83,8 @@ struct FlexOutFormat {
   std::string headerPrefix;
 };
 
-// One store file. Every call reads or writes the file afresh.
+// One store file. Every call reads the file once; a save writes the whole
+// format with one write of the file, keeping the other formats byte for byte.
 class FlexStore {
  public:
   explicit FlexStore(std::string path) : path_(std::move(path)) {}

@@ -88,7 +88,7 @@ class TranslateWindowTest : public ::testing::Test {
       EXPECT_TRUE(on == 0 || on == names.size()) << label;
       if (on) s += label;
     }
-    if (!text("txtActionLocation").empty()) s += " " + text("txtActionLocation");
+    if (!text("txtActionLocation").empty()) s.append(1, ' ').append(text("txtActionLocation"));
     return s + (child<QCheckBox>("chkActionDefault")->isChecked() ? " default" : "");
   }
 
