@@ -2,6 +2,7 @@
 
 #include <QApplication>
 #include <QEventLoop>
+#include <QFontMetrics>
 #include <QPointer>
 #include <QThread>
 #include <algorithm>
@@ -34,6 +35,10 @@ BusyProgress::BusyProgress(const QString& label, QWidget* owner, SharedProgress*
     : QProgressDialog(label, QString(), 0, 0, owner), label_(label), progress_(progress) {
   setObjectName("frmBusy");
   setWindowTitle(kAppTitle);
+  // Wide enough for the whole title beside the title bar's buttons.
+  setMinimumWidth(
+      QFontMetrics(QApplication::font("QWorkspaceTitleBar")).horizontalAdvance(windowTitle()) +
+      160);
   setWindowModality(Qt::WindowModal);
   if (progress_) {
     setCancelButtonText("Cancel");

@@ -77,7 +77,6 @@ Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
     UserWait wait;
     QMessageBox box(wait.owner());
     box.setWindowTitle(Title(title));
-    KeepTitleWhole(box);
     box.setTextFormat(Qt::PlainText);
     box.setText(Text(text));
     switch (icon) {
@@ -116,6 +115,8 @@ Answer QtUi::message(const std::string& text, Icon icon, Buttons buttons,
         box.setEscapeButton(QMessageBox::Cancel);
         break;
     }
+    // Last: setting the icon or the buttons lays the box out again.
+    KeepTitleWhole(box);
     switch (box.exec()) {
       case QMessageBox::Yes:
         return Answer::Yes;
