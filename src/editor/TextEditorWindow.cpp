@@ -147,7 +147,7 @@ void TextEditorWindow::buildMenus() {
   viewMenu_->menuAction()->setVisible(false);
 }
 
-void TextEditorWindow::showTextEditor(const QString& path, const QString& typeText, bool viewOnly) {
+bool TextEditorWindow::showTextEditor(const QString& path, const QString& typeText, bool viewOnly) {
   viewOnly_ = viewOnly;
   text_->setReadOnly(viewOnly);
   for (const char* name :
@@ -164,9 +164,10 @@ void TextEditorWindow::showTextEditor(const QString& path, const QString& typeTe
   recordView_ = false;
   setViewChecks();
   path_ = path;
-  load(path);
+  const bool loaded = load(path);
   changed_ = false;
   setCaption("VORN File Viewer");
+  return loaded;
 }
 
 void TextEditorWindow::showNew(const QString& typeText) {
@@ -192,21 +193,21 @@ void TextEditorWindow::setCaption(const QString& prefix) {
   setWindowTitle(path_.isEmpty() ? prefix : prefix + " - " + path_);
 }
 
-void TextEditorWindow::load(const QString& path) {
+bool TextEditorWindow::load(const QString& path) {
   if (path.isEmpty()) {
     text_->clear();
-    return;
+    return true;
   }
   QFile file(path);
   if (!QFileInfo(path).isFile() || !file.open(QIODevice::ReadOnly)) {
     ui_.exclaim("The file '" + Std(path) + "' doesn't exist.");
-    return;
+    return false;
   }
   if (file.size() > kLargestFile) {
     ui_.exclaim("The file '" + Std(path) + "' is too large to be shown here (" +
                 std::to_string(file.size() >> 20) + " MB; at most " +
                 std::to_string(kLargestFile >> 20) + " MB).");
-    return;
+    return false;
   }
   QByteArray bytes = file.readAll();
   // CR LF pairs become single line breaks; other bytes stay.
@@ -223,6 +224,7 @@ void TextEditorWindow::load(const QString& path) {
   setText(text);
   text_->setReadOnly(viewOnly_);
   changed_ = false;
+  return true;
 }
 
 // A long text goes in piece by piece behind a progress window, so that the
@@ -451,9 +453,11 @@ QWidget* OpenTextEditor(Ui& ui, const std::string& path, const std::string& type
   editor->show();
   if (path.empty() && mode == EditorMode::Editor) {
     editor->showNew(QString::fromStdString(type));
-  } else {
-    editor->showTextEditor(QString::fromStdString(path), QString::fromStdString(type),
-                           mode == EditorMode::Viewer);
+  } else if (!editor->showTextEditor(QString::fromStdString(path), QString::fromStdString(type),
+                                     mode == EditorMode::Viewer)) {
+    // No empty window is left behind a file that could not be shown.
+    editor->close();
+    return nullptr;
   }
   return editor;
 }

@@ -28,7 +28,8 @@ class TextEditorWindow : public QMainWindow {
 
   // Show_TextEditor: loads the file as a viewer (`viewOnly`) or an editor;
   // typeText such as "Out File (*.OUT)" gives the open and save filter.
-  void showTextEditor(const QString& path, const QString& typeText, bool viewOnly);
+  // False (the reason shown) when the file cannot be shown.
+  bool showTextEditor(const QString& path, const QString& typeText, bool viewOnly);
   // Show_New: an empty editor.
   void showNew(const QString& typeText);
 
@@ -60,7 +61,7 @@ class TextEditorWindow : public QMainWindow {
 
  private:
   void buildMenus();
-  void load(const QString& path);
+  bool load(const QString& path);
   void setText(const QString& text);
   bool writeText(const QString& path);
   // Asks to save changes; false when the operation must not go on.

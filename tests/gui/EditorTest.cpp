@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <QAction>
+#include <QApplication>
 #include <QCheckBox>
 #include <QLabel>
 #include <QLineEdit>
@@ -83,8 +84,21 @@ TEST_F(EditorTest, ViewerHidesTheEditingMenusAndShowsViewsForTaggedFiles) {
 }
 
 TEST_F(EditorTest, MissingFileIsReportedAndStatusBarFollowsTheCaret) {
-  editor.showTextEditor(QString::fromStdString(dir.file("gone.OUT")), "Out File (*.OUT)", false);
+  EXPECT_FALSE(editor.showTextEditor(QString::fromStdString(dir.file("gone.OUT")),
+                                     "Out File (*.OUT)", false));
   EXPECT_EQ(Take(ui), "E VORN Zurevazidu: The file '" + dir.file("gone.OUT") + "' doesn't exist.");
+  // Opened as a window of its own, a file that cannot be shown leaves none behind.
+  const std::string large = dir.write("large.CTL", "");
+  std::filesystem::resize_file(large, (std::uintmax_t{33} << 20) + 1);
+  for (const std::string& path : {dir.file("gone.OUT"), large}) {
+    EXPECT_EQ(OpenTextEditor(ui, path, "Out File (*.OUT)", EditorMode::Viewer), nullptr);
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    for (QWidget* w : QApplication::topLevelWidgets())
+      EXPECT_FALSE(qobject_cast<TextEditorWindow*>(w) && w->isVisible() && w != &editor) << path;
+  }
+  EXPECT_EQ(Take(ui), "E VORN Zurevazidu: The file '" + dir.file("gone.OUT") +
+                          "' doesn't exist.\nE VORN Zurevazidu: The file '" + large +
+                          "' is too large to be shown here (33 MB; at most 32 MB).");
   EXPECT_FALSE(text()->isReadOnly());
 
   text()->setPlainText("first\nsecond line\nthird");
