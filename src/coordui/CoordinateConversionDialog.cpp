@@ -10,6 +10,8 @@
 #include <QRadioButton>
 #include <QVBoxLayout>
 
+#include "platform/qt/Controls.h"
+
 namespace zv {
 
 namespace {
@@ -26,30 +28,8 @@ constexpr const char* kCaptions[] = {
     "Coordinate &System:", "&Zone:",           "&Horizontal Datum:",
     "Horizontal &Units:",  "&Vertical Datum:", "V&ertical Units:"};
 
-QComboBox* MakeList(QWidget* parent, const QString& name) {
-  auto* list = new QComboBox(parent);
-  list->setObjectName(name);
-  list->setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
-  list->setMinimumContentsLength(28);
-  return list;
-}
-
-QPushButton* MakeButton(QWidget* parent, const char* name, const QString& text) {
-  auto* button = new QPushButton(text, parent);
-  button->setObjectName(name);
-  button->setAutoDefault(false);
-  return button;
-}
-
 void ShowList(QComboBox* box, const FormList& list) {
-  QStringList items;
-  for (const auto& item : list.items) items << QString::fromStdString(item);
-  QStringList shown;
-  for (int i = 0; i < box->count(); ++i) shown << box->itemText(i);
-  if (shown != items) {
-    box->clear();
-    box->addItems(items);
-  }
+  SetItems(box, list.items);
   box->setCurrentIndex(box->findText(QString::fromStdString(list.selected), Qt::MatchExactly));
   box->setEnabled(list.enabled);
 }
@@ -82,7 +62,7 @@ CoordinateConversionDialog::CoordinateConversionDialog(Ui& ui, std::string appFo
     auto* grid = new QGridLayout(frame);
     for (int f = 0; f < 6; ++f) {
       QComboBox* box =
-          MakeList(frame, QString(kListNames[f]) + (in ? QString("In") : QString("Out")));
+          MakeList(frame, QString(kListNames[f]) + (in ? QString("In") : QString("Out")), 28);
       auto* label = new QLabel(kCaptions[f], frame);
       label->setBuddy(box);
       grid->addWidget(label, f, 0);
@@ -104,7 +84,7 @@ CoordinateConversionDialog::CoordinateConversionDialog(Ui& ui, std::string appFo
   convergence_ = check("chkConvertFConvAngle", "Compute &Convergence Angle");
   latLong_ = check("chkConvertFLatLong", "Add &Latitude/Longitude");
   geoid_ = check("chkConvertFGeoid", "Compute &Geoid Heights");
-  geoidModel_ = MakeList(options, "cmbConvertFGeoid");
+  geoidModel_ = MakeList(options, "cmbConvertFGeoid", 28);
   geoidModel_->setMinimumContentsLength(12);
   geoidLabel_ = new QLabel("Geoid &Model:", options);
   geoidLabel_->setObjectName("lblConvertFGeoid");

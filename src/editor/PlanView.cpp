@@ -24,6 +24,7 @@
 #include "app/AppContext.h"
 #include "app/FileTypes.h"
 #include "platform/Ui.h"
+#include "platform/qt/Controls.h"
 
 namespace zv {
 
@@ -374,10 +375,7 @@ PlanWindow::PlanWindow(Ui& ui, PlanModel model, const QString& path, Records rec
 
   auto add = [this](QMenu* menu, const char* name, const QString& text, auto slot,
                     QKeySequence keys = {}) {
-    QAction* a = menu->addAction(text, this, slot);
-    a->setObjectName(name);
-    a->setShortcut(keys);
-    return a;
+    return AddAction(menu, this, name, text, slot, keys);
   };
   QMenu* file = menuBar()->addMenu("&File");
   add(file, "mnuPlanExportPng", "Export &PNG...", &PlanWindow::exportPng);

@@ -22,6 +22,7 @@
 #include "editor/PlanView.h"
 #include "platform/TextIo.h"
 #include "platform/Ui.h"
+#include "platform/qt/Controls.h"
 #include "survey/Listing.h"
 
 namespace zv {
@@ -96,10 +97,7 @@ TextEditorWindow::~TextEditorWindow() {
 void TextEditorWindow::buildMenus() {
   auto add = [this](QMenu* menu, const char* name, const QString& text, auto slot,
                     QKeySequence keys = {}) {
-    QAction* a = menu->addAction(text, this, slot);
-    a->setObjectName(name);
-    a->setShortcut(keys);
-    return a;
+    return AddAction(menu, this, name, text, slot, keys);
   };
   QMenu* file = menuBar()->addMenu("&File");
   file->setObjectName("mnuFile");

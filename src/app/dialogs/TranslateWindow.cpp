@@ -16,35 +16,14 @@
 #include "editor/PlanView.h"
 #include "platform/TextIo.h"
 #include "platform/qt/BackgroundRun.h"
+#include "platform/qt/Controls.h"
 
 namespace zv {
 
 namespace {
 
-QComboBox* MakeList(QWidget* parent, const char* name) {
-  auto* list = new QComboBox(parent);
-  list->setObjectName(name);
-  list->setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
-  list->setMinimumContentsLength(36);
-  return list;
-}
-
-QPushButton* MakeButton(QWidget* parent, const char* name, const QString& text) {
-  auto* button = new QPushButton(text, parent);
-  button->setObjectName(name);
-  button->setAutoDefault(false);
-  return button;
-}
-
 void ShowList(QComboBox* box, const ChoiceList& list) {
-  QStringList items;
-  for (const auto& item : list.items) items << QString::fromStdString(item);
-  QStringList shown;
-  for (int i = 0; i < box->count(); ++i) shown << box->itemText(i);
-  if (shown != items) {
-    box->clear();
-    box->addItems(items);
-  }
+  SetItems(box, list.items);
   box->setCurrentIndex(list.selected);
 }
 
@@ -66,7 +45,7 @@ TranslateWindow::TranslateWindow(AppContext& ctx, QWidget* parent)
                    const char* browse, const QString& browseText, const QString& typeCaption) {
     auto* box = new QGroupBox(title, page);
     box->setObjectName(name);
-    list = MakeList(box, listName);
+    list = MakeList(box, listName, 36);
     group.label = new QLabel(caption, box);
     group.label->setObjectName(label);
     group.text = new QLineEdit(box);
