@@ -3,6 +3,7 @@
 #include <ostream>
 
 #include "app/AppContext.h"
+#include "platform/ConsoleUi.h"
 
 namespace zv {
 
@@ -17,10 +18,7 @@ bool ConsoleDialogs::enterPoint(const ManualEntrySetup&, SurveyPoint&) {
 }
 
 void ConsoleDialogs::showReport(const std::string& report) {
-  std::string text = report;
-  for (size_t at = text.find('\r'); at != std::string::npos; at = text.find('\r', at))
-    text.erase(at, 1);
-  out_ << "view: Coordinate Conversion Results\n" << text << '\n';
+  out_ << "view: Coordinate Conversion Results\n" << WithLineBreaks(report) << '\n';
 }
 
 }  // namespace zv

@@ -28,17 +28,6 @@ const char* IconName(Icon icon) {
   return "none";
 }
 
-// Each CR LF of a message becomes a line break.
-std::string WithLineBreaks(const std::string& text) {
-  std::string out;
-  out.reserve(text.size());
-  for (size_t i = 0; i < text.size(); ++i) {
-    if (text[i] == '\r' && i + 1 < text.size() && text[i + 1] == '\n') continue;
-    out += text[i];
-  }
-  return out;
-}
-
 // The answer without blanks and line end, in lower case.
 std::string Lower(std::string s) {
   while (!s.empty() && s.back() == '\r') s.pop_back();
@@ -116,6 +105,17 @@ std::optional<std::string> ConsoleUi::chooseFile(const FileDialogRequest& reques
   message("The file dialog \"" + request.title + "\" needs a display.", Icon::Exclamation,
           Buttons::Ok, kAppTitle);
   return std::nullopt;
+}
+
+// Each CR LF of a message becomes a line break.
+std::string WithLineBreaks(const std::string& text) {
+  std::string out;
+  out.reserve(text.size());
+  for (size_t i = 0; i < text.size(); ++i) {
+    if (text[i] == '\r' && i + 1 < text.size() && text[i + 1] == '\n') continue;
+    out += text[i];
+  }
+  return out;
 }
 
 }  // namespace zv

@@ -9,6 +9,9 @@
 
 namespace zv {
 
+// Each CR LF of a text becomes a line break.
+std::string WithLineBreaks(const std::string& text);
+
 class ConsoleUi : public Ui {
  public:
   ConsoleUi(std::istream& in, std::ostream& out, std::ostream& err);
