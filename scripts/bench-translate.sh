@@ -4,7 +4,10 @@
 #   translate: control to points-and-chains (default 1,000,000 points)
 #   reproject: control reprojected from Wisconsin Central to Wisconsin South,
 #              both NAD 83, no datum shift (default 100,000 points)
-# usage: scripts/bench-translate.sh [translate|reproject] [points] [runs]
+#   flex:      comma-separated point, northing, easting, elevation, code file
+#              to a control file with the user format "PNEZD Comma"
+#              (default 1,000,000 points)
+# usage: scripts/bench-translate.sh [translate|reproject|flex] [points] [runs]
 set -e
 cd "$(dirname "$0")/.."
 MODE=${1:-translate}
@@ -19,11 +22,21 @@ case "$MODE" in
     POINTS=${2:-100000}
     printf '[Coordinate Conversion]\r\nOutput Coordinate System=State Plane 1983\r\nOutput Zone=Wisconsin South 4803\r\nOutput Horizontal Datum=NAD 83\r\nOutput Horizontal Units=U.S. Survey Feet\r\nOutput Vertical Datum=NAVD 88\r\nOutput Vertical Units=U.S. Survey Feet\r\nScale Factor=1\r\nConvergence Angle=1\r\nLat Long=1\r\nGeoid Heights=0\r\n' >"$WORK/settings.TRN"
     JOB="CTLREPROJ|$WORK/big.ctl|$WORK/big.out|$WORK/settings.TRN" ;;
-  *) echo "usage: $0 [translate|reproject] [points] [runs]" >&2; exit 2 ;;
+  flex)
+    POINTS=${2:-1000000}
+    JOB="FLEX2CTL|$WORK/big.csv|$WORK/big.out|PNEZD Comma" ;;
+  *) echo "usage: $0 [translate|reproject|flex] [points] [runs]" >&2; exit 2 ;;
 esac
 sh scripts/build.sh >/dev/null
-build/bench/translate/zv_make_control "$POINTS" "$WORK/big.ctl"
-IN_MB=$(du -m "$WORK/big.ctl" | cut -f1)
+if [ "$MODE" = flex ]; then
+  INPUT="$WORK/big.csv"
+  awk -v n="$POINTS" 'BEGIN { for (i = 1; i <= n; i++)
+    printf "%d,%.3f,%.3f,%.3f,CP\r\n", i, 400000 + i * 0.013, 2100000 + i * 0.021, 800 + (i % 997) * 0.1 }' >"$INPUT"
+else
+  INPUT="$WORK/big.ctl"
+  build/bench/translate/zv_make_control "$POINTS" "$INPUT"
+fi
+IN_MB=$(du -m "$INPUT" | cut -f1)
 for i in $(seq "$RUNS"); do
   rm -f "$WORK/big.out"
   ZUREVAZIDU_UI=console /usr/bin/time -f "%e %M" -o "$WORK/time.$i" build/app/zurevazidu "-t|$JOB" </dev/null

@@ -2,7 +2,7 @@
 # Installs the Debian packages the build and the tests need (root or sudo).
 set -e
 PACKAGES="cmake ninja-build g++ clang libclang-rt-14-dev libgtest-dev libgmock-dev \
-libbenchmark-dev libproj-dev proj-bin proj-data qt6-base-dev xvfb xauth xdotool openbox x11-apps time python3"
+libbenchmark-dev libproj-dev proj-bin proj-data qt6-base-dev xvfb xauth xdotool openbox x11-apps time python3 pkg-config"
 missing=""
 for p in $PACKAGES; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing="$missing $p"

@@ -45,7 +45,9 @@ bool Translate(AppContext& ctx, const TranslationJob& job) {
     call.outputType = def.Output;
     if (call.configurationPath.empty()) call.configurationPath = def.ConfigFile;
   }
-  if (!call.configurationPath.empty() && !FileExists(call.configurationPath)) {
+  // A user-defined file's configuration is the name of its format.
+  if (!call.configurationPath.empty() && !ConfigurationNamesFormat(program, call) &&
+      !FileExists(call.configurationPath)) {
     ctx.ui.exclaim("The specified Translation/Filter file '" + call.configurationPath +
                    "' does not exist.");
     return false;

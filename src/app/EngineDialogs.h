@@ -10,6 +10,7 @@
 #include "geodesy/ConversionDriver.h"
 #include "geodesy/ConversionForm.h"
 #include "survey/SurveyModel.h"
+#include "tools/Localization.h"
 
 namespace zv {
 
@@ -27,6 +28,20 @@ class EngineDialogs {
   virtual bool enterPoint(const ManualEntrySetup& setup, SurveyPoint& point) = 0;
   // The results dialog with the report text, modal.
   virtual void showReport(const std::string& report) = 0;
+  // The FlexIn dialog over the input file: true when its OK read the file
+  // into the input side. Without a display it says so and fails.
+  virtual bool flexIn(AppContext& ctx, const std::string& path);
+  // The FlexOut dialog over the output file (the output side filled): true
+  // when its OK wrote the file. Without a display it says so and fails.
+  virtual bool flexOut(AppContext& ctx, const std::string& path);
+  // The grid-to-local and local-to-grid dialogs, modal; their OK runs the
+  // localization tool through `run`. True when a run succeeded. Without a
+  // display they say so and fail.
+  virtual bool gridToLocal(AppContext& ctx, const std::string& input, const std::string& output,
+                           const GridToLocalRunner& run);
+  virtual bool localToGrid(AppContext& ctx, const RecordedGridReference& recorded,
+                           const std::string& input, const std::string& output,
+                           const LocalToGridRunner& run);
 };
 
 // Without a display: the dialogs that need one say so and fail; a report is

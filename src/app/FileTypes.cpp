@@ -15,12 +15,14 @@ bool Adapt(AppContext& ctx, const std::string& path) {
   return Fn(ctx.ui, ctx.work, path);
 }
 
-// User-defined files are read and written through the flex dialogs.
-bool NeedsFlexDialog(AppContext& ctx, const std::string&) {
-  ctx.ui.exclaim(
-      "User-defined files are read and written through the user format dialogs, which need a "
-      "display.");
-  return false;
+// User-defined files are read and written through the FlexIn and FlexOut
+// dialogs (an unattended run resolves the format itself, see Routines).
+bool ReadThroughFlexDialog(AppContext& ctx, const std::string& path) {
+  return ctx.dialogs->flexIn(ctx, path);
+}
+
+bool WriteThroughFlexDialog(AppContext& ctx, const std::string& path) {
+  return ctx.dialogs->flexOut(ctx, path);
 }
 
 constexpr FileType kTypes[] = {
@@ -35,7 +37,7 @@ constexpr FileType kTypes[] = {
     {"Wisconsin Summary Index Files (*.WSI)", Adapt<ReadWsiFile>, Adapt<WriteWsiFile>,
      Adapt<WriteWsiFile>},
     {"CAiCE SRV Files (*.SRV)", Adapt<ReadSrvFile>, Adapt<WriteSrvFile>, Adapt<WriteSrvFile>},
-    {kUserDefinedType, NeedsFlexDialog, NeedsFlexDialog, nullptr},
+    {kUserDefinedType, ReadThroughFlexDialog, WriteThroughFlexDialog, nullptr},
 };
 
 }  // namespace

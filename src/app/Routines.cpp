@@ -9,17 +9,34 @@
 #include "platform/Error.h"
 #include "platform/Settings.h"
 #include "tools/SearchReplace.h"
+#include "userformats/FlexUnattended.h"
 
 namespace zv {
 
-bool ConvertFile(AppContext& ctx, const RoutineCall& call) {
+namespace {
+
+bool ReadFlexUnattended(AppContext& ctx, const RoutineCall& call) {
+  const std::optional<FlexInChoices> choices =
+      UnattendedFlexInChoices(ctx.ui, ctx.appFolder, *ctx.settings, call.configurationPath);
+  return choices && FlexIn(ctx.ui, ctx.work, ctx.appFolder, call.inputPath, *choices);
+}
+
+bool WriteFlexUnattended(AppContext& ctx, const RoutineCall& call) {
+  const std::optional<FlexOutChoices> choices = UnattendedFlexOutChoices(
+      ctx.ui, ctx.appFolder, *ctx.settings, call.configurationPath, &ctx.work.OutputHeader);
+  return choices && FlexOut(ctx.ui, ctx.work, ctx.appFolder, call.outputPath, *choices);
+}
+
+bool Convert(AppContext& ctx, const RoutineCall& call, bool unattended) {
   const FileType* in = FindFileType(call.inputType);
   if (!in || !in->reader) {
     ctx.ui.exclaim("Can not convert from " + call.inputType, "Invalid Format");
     return false;
   }
   ctx.work.clearInput();
-  if (!in->reader(ctx, call.inputPath)) return false;
+  const bool read = unattended && in->name == kUserDefinedType ? ReadFlexUnattended(ctx, call)
+                                                               : in->reader(ctx, call.inputPath);
+  if (!read) return false;
   const FileType* out = FindFileType(call.outputType);
   if (!out || !out->writer) {
     ctx.ui.exclaim("Can not convert to " + call.outputType, "Invalid Format");
@@ -27,7 +44,23 @@ bool ConvertFile(AppContext& ctx, const RoutineCall& call) {
   }
   // The input side is not looked at again before the next run clears it.
   ctx.work.copyInputToOutput(/*moveInput=*/true);
+  if (unattended && out->name == kUserDefinedType) return WriteFlexUnattended(ctx, call);
   return out->writer(ctx, call.outputPath);
+}
+
+}  // namespace
+
+bool ConvertFile(AppContext& ctx, const RoutineCall& call) {
+  return Convert(ctx, call, /*unattended=*/false);
+}
+
+bool ConvertFileUnattended(AppContext& ctx, const RoutineCall& call) {
+  return Convert(ctx, call, /*unattended=*/true);
+}
+
+bool ConfigurationNamesFormat(std::string_view program, const RoutineCall& call) {
+  return program == "ConvertFile" &&
+         (call.inputType == kUserDefinedType || call.outputType == kUserDefinedType);
 }
 
 bool ReplaceRoutine(AppContext& ctx, const RoutineCall& call) {
@@ -118,7 +151,7 @@ namespace {
 
 std::vector<Routine> MakeUnattendedRoutines() {
   std::vector<Routine> routines = {
-      {"ConvertFile", ConvertFile},
+      {"ConvertFile", ConvertFileUnattended},
       {"Replace", ReplaceRoutine},
       {"CoordConvert", CoordConvertRoutine},
       {"MultiPoint", MultiPointRoutine},

@@ -44,6 +44,13 @@ bool RunShowingErrors(Ui& ui, const std::function<bool()>& routine);
 // Reads the input with its type's reader and writes it with the output
 // type's writer. A reader that fails ends the run.
 bool ConvertFile(AppContext& ctx, const RoutineCall& call);
+// The same without dialogs: a user-defined file is read or written with the
+// format that the configuration names (else the one last used in the
+// window) and the reference stored with it or remembered.
+bool ConvertFileUnattended(AppContext& ctx, const RoutineCall& call);
+// True when the configuration of an unattended run names a user format
+// rather than a file: "ConvertFile" from or to a user-defined file.
+bool ConfigurationNamesFormat(std::string_view program, const RoutineCall& call);
 // Filters the input into the output under the configuration's commands.
 bool ReplaceRoutine(AppContext& ctx, const RoutineCall& call);
 

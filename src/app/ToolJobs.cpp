@@ -91,9 +91,10 @@ bool WriteJobFile(Ui& ui, const ToolPlace& place, const std::vector<std::string>
 // Runs the tool in its job folder, waits, and removes the job file. The
 // empty output made for a tool that does not start is removed as well.
 bool RunTool(Ui& ui, const ToolPlace& place, const ToolSpec& tool,
-             const std::string& madeOutput = "") {
+             const std::string& madeOutput = "", int* exitCode = nullptr) {
   ConsoleWindow window{1, tool.title, place.left, place.top, 640, 125, 240};
   ProcessResult run = RunAndWait(ToolPath(place, tool), {}, place.jobFolder, window);
+  if (exitCode) *exitCode = run.exitCode;
   std::error_code ec;
   fs::remove(JobPath(place), ec);
   if (!run.started) {
@@ -232,6 +233,43 @@ bool LocalLocalToGridJob(Ui& ui, const std::string& input, const std::string& ou
 bool LocalRun(Ui& ui, const ToolPlace& place) {
   if (!ToolPresent(ui, place, kLocal)) return false;
   return RunTool(ui, place, kLocal);
+}
+
+std::string LocalResultPath(const std::string& input, const std::string& output) {
+  return WithoutExtension(ShortPath(output)) + fs::path(ShortPath(input)).extension().string();
+}
+
+std::string LocalErrorPath(const ToolPlace& place) {
+  return place.jobFolder + "/LOCAL.ERR";
+}
+
+std::string LatLongReportPath(const ToolPlace& place) {
+  return place.jobFolder + "/LATLONG.OUT";
+}
+
+bool LocalRunChecked(Ui& ui, const ToolPlace& place, const std::string& input,
+                     const std::string& output) {
+  if (!ToolPresent(ui, place, kLocal)) return false;
+  // Only this run's message and report count.
+  std::error_code ec;
+  fs::remove(LocalErrorPath(place), ec);
+  fs::remove(LatLongReportPath(place), ec);
+  const std::string result = LocalResultPath(input, output);
+  int exitCode = 0;
+  if (!RunTool(ui, place, kLocal, "", &exitCode)) return false;
+  std::vector<std::string> message;
+  if (ReadTextLines(LocalErrorPath(place), message) && !message.empty()) {
+    fs::remove(LocalErrorPath(place), ec);
+    std::string text;
+    for (const std::string& line : message) text.append(text.empty() ? "" : "\r\n").append(line);
+    ui.exclaim(text, "Local.EXE");
+    return false;
+  }
+  if (exitCode != 0 || !fs::is_regular_file(result, ec) || fs::file_size(result, ec) == 0) {
+    ui.exclaim("Local.EXE did not write '" + result + "'.", "Local.EXE");
+    return false;
+  }
+  return true;
 }
 
 std::string ConvertReportPath(const ToolPlace& place) {

@@ -60,6 +60,17 @@ bool LocalLocalToGridJob(Ui& ui, const std::string& input, const std::string& ou
                          const std::string& text1, const std::string& text2,
                          const std::string& text3, const ToolPlace& place);
 bool LocalRun(Ui& ui, const ToolPlace& place);
+// Where Local.EXE writes its result: the output path without its last four
+// characters, with the input's extension (the tool keeps the file's format).
+std::string LocalResultPath(const std::string& input, const std::string& output);
+// What Local.EXE leaves in its job folder: the message of a failure, and the
+// report of the points of a computed factor.
+std::string LocalErrorPath(const ToolPlace& place);
+std::string LatLongReportPath(const ToolPlace& place);
+// Runs Local.EXE on the job written, then checks that it did its job: the
+// tool's message, or that it left no result, is reported; false then.
+bool LocalRunChecked(Ui& ui, const ToolPlace& place, const std::string& input,
+                     const std::string& output);
 
 // Report files the tools leave in their job folder: the codes CONVERT.EXE
 // found no match for, and the free point numbers of SORT.EXE.

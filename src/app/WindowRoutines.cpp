@@ -6,6 +6,7 @@
 #include "app/AppContext.h"
 #include "app/ToolJobs.h"
 #include "platform/TextIo.h"
+#include "tools/Localization.h"
 #include "tools/SearchReplace.h"
 
 namespace zv {
@@ -111,12 +112,52 @@ bool RunTool(WindowRun& run, const ToolRoutine& tool) {
   return false;
 }
 
+// "Local.EXE": the file's direction and its dialog, whose OK writes the
+// tool's job and runs it; then the tool's report and the output. A run that
+// fails removes the empty output made for the tool.
+bool RunLocalize(WindowRun& run) {
+  Ui& ui = run.ctx.ui;
+  const std::string& output = run.call.outputPath;
+  const bool existed = FileExists(output);
+  auto checked = [&](bool done) {
+    std::error_code ec;
+    if (!done && !existed && std::filesystem::file_size(output, ec) == 0) {
+      std::filesystem::remove(output, ec);
+    }
+    return done;
+  };
+  auto place = [&](int left, int top) { return PintrelPlace(run.ctx.appFolder, left, top); };
+  const GridToLocalRunner toLocal = [&](const GridToLocalRequest& r) {
+    const ToolPlace p = place(r.consoleLeft, r.consoleTop);
+    return checked(LocalGridToLocalJob(ui, r.input, r.output, r.mode, r.modeText, p) &&
+                   LocalRunChecked(ui, p, r.input, r.output));
+  };
+  const LocalToGridRunner toGrid = [&](const LocalToGridRequest& r) {
+    const ToolPlace p = place(r.consoleLeft, r.consoleTop);
+    return checked(
+        LocalLocalToGridJob(ui, r.input, r.output, r.datumYear, r.zoneCode, r.factor, p) &&
+        LocalRunChecked(ui, p, r.input, r.output));
+  };
+  EngineDialogs& dialogs = *run.ctx.dialogs;
+  const LocalizeDialogs localize{
+      [&](const std::string& in, const std::string& out) {
+        return dialogs.gridToLocal(run.ctx, in, out, toLocal);
+      },
+      [&](const RecordedGridReference& recorded, const std::string& in, const std::string& out) {
+        return dialogs.localToGrid(run.ctx, recorded, in, out, toGrid);
+      }};
+  ui.setBusy(false);
+  const bool done = Localize(ui, run.call.inputPath, output, localize);
+  const std::string report = LatLongReportPath(place(0, 0));
+  if (FileExists(report)) ShowAndDeleteReport(ui, report, "Out File (*.OUT)");
+  if (done) ViewOutput(run);
+  return done;
+}
+
 std::vector<WindowRoutine> MakeWindowRoutines() {
   std::vector<WindowRoutine> routines = {
-      {"ConvertFile", RunConvertFile},
-      {"Replace", RunReplace},
-      {"SinglePoint", RunSinglePoint},
-      {"MultiPoint", RunMultiPoint},
+      {"ConvertFile", RunConvertFile}, {"Replace", RunReplace},    {"SinglePoint", RunSinglePoint},
+      {"MultiPoint", RunMultiPoint},   {"Local.EXE", RunLocalize},
   };
   for (const ToolRoutine& tool : ToolRoutines()) routines.push_back({tool.program, nullptr, &tool});
   return routines;

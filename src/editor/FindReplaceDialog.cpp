@@ -10,7 +10,9 @@
 #include <QTextDocument>
 #include <QVBoxLayout>
 
+#include "editor/LineView.h"
 #include "platform/Ui.h"
+#include "platform/qt/BackgroundRun.h"
 
 namespace zv {
 
@@ -65,6 +67,12 @@ FindReplaceDialog::FindReplaceDialog(Ui& ui, QWidget* parent) : QDialog(parent),
 
 void FindReplaceDialog::setTarget(QPlainTextEdit* target) {
   target_ = target;
+  view_ = nullptr;
+}
+
+void FindReplaceDialog::setTarget(LineView* target) {
+  view_ = target;
+  target_ = nullptr;
 }
 
 void FindReplaceDialog::setReplaceMode(bool on) {
@@ -119,6 +127,7 @@ QTextCursor FindReplaceDialog::search(const QTextCursor& cursor) const {
 }
 
 bool FindReplaceDialog::findNext() {
+  if (view_) return findInView();
   if (!target_) return false;
   const QTextCursor hit = search(target_->textCursor());
   if (hit.isNull()) {
@@ -134,6 +143,48 @@ bool FindReplaceDialog::find() {
   return findNext();
 }
 
+// Searches a large file off the GUI thread behind a progress window with
+// Cancel; a cancelled search says nothing.
+bool FindReplaceDialog::findInView() {
+  const QString needle = findText_->text();
+  if (needle.isEmpty()) return false;
+  const Qt::CaseSensitivity cs = matchCase_->isChecked() ? Qt::CaseSensitive : Qt::CaseInsensitive;
+  // After a selection that is the search text, else from the caret.
+  LineView::Position from = std::max(view_->anchor(), view_->caret());
+  if (!view_->hasSelection() || view_->anchor().line != view_->caret().line ||
+      view_->selectedText().compare(needle, cs) != 0)
+    from = view_->caret();
+  std::optional<LineView::Position> hit;
+  LineView* view = view_;
+  const bool wholeWords = matchWord_->isChecked();
+  // The view and this dialog take no input until the search has ended; the
+  // window keeps its file meanwhile (searching()).
+  QWidget* window = view->window();
+  view->setEnabled(false);
+  setEnabled(false);
+  searching_ = true;
+  bool cancelled = false;
+  try {
+    RunInBackground(window, "Searching...", [&] {
+      hit = view->search(needle, from, cs == Qt::CaseSensitive, wholeWords, CurrentRunProgress());
+      return true;
+    });
+  } catch (const RunCancelled&) {
+    cancelled = true;
+  }
+  searching_ = false;
+  setEnabled(true);
+  view->setEnabled(true);
+  if (cancelled) return false;
+  if (!hit) {
+    ui_.inform("Search String Not Found.");
+    return false;
+  }
+  view->setSelection(*hit, {hit->line, hit->column + needle.size()});
+  view->setFocus();
+  return true;
+}
+
 bool FindReplaceDialog::replace() {
   if (!target_) return false;
   QTextCursor cursor = target_->textCursor();
@@ -144,24 +195,38 @@ bool FindReplaceDialog::replace() {
   return findNext();
 }
 
+// The occurrences are found in one pass over the text and replaced in one
+// edit (one undo step), each in place: rebuilding the whole text would cost
+// far more than the edits. Each search goes on after the replaced text, so a
+// replacement that holds the search text is not found again.
 int FindReplaceDialog::replaceAll() {
   if (!target_) return 0;
   const int caret = target_->textCursor().position();
-  QTextCursor cursor(target_->document());
+  const QString needle = findText_->text();
+  const QString with = replaceText_->text();
+  const Qt::CaseSensitivity cs = matchCase_->isChecked() ? Qt::CaseSensitive : Qt::CaseInsensitive;
+  const bool wholeWords = matchWord_->isChecked();
   int count = 0;
-  cursor.beginEditBlock();
-  // Each search goes on after the inserted text, so a replacement that
-  // holds the search text is not found again.
-  for (QTextCursor hit = search(cursor); !hit.isNull(); hit = search(hit)) {
-    hit.insertText(replaceText_->text());
-    ++count;
+  if (!needle.isEmpty()) {
+    // Raw text: one character per document position (U+2029 between blocks).
+    const QString text = target_->document()->toRawText();
+    QTextCursor edit(target_->document());
+    qsizetype shift = 0;
+    for (qsizetype at = FindInLine(text, needle, 0, cs, wholeWords); at >= 0;
+         at = FindInLine(text, needle, at + needle.size(), cs, wholeWords)) {
+      if (count++ == 0) edit.beginEditBlock();
+      edit.setPosition(static_cast<int>(at + shift));
+      edit.setPosition(static_cast<int>(at + shift + needle.size()), QTextCursor::KeepAnchor);
+      edit.insertText(with);
+      shift += with.size() - needle.size();
+    }
+    if (count > 0) edit.endEditBlock();
   }
-  cursor.endEditBlock();
   QTextCursor restore(target_->document());
   restore.setPosition(std::min(caret, target_->document()->characterCount() - 1));
   target_->setTextCursor(restore);
-  ui_.inform("Replaced '" + findText_->text().toStdString() + "' with '" +
-             replaceText_->text().toStdString() + "' " + std::to_string(count) + " time(s).");
+  ui_.inform("Replaced '" + needle.toStdString() + "' with '" + with.toStdString() + "' " +
+             std::to_string(count) + " time(s).");
   return count;
 }
 

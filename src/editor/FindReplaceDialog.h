@@ -13,6 +13,7 @@ class QTextCursor;
 
 namespace zv {
 
+class LineView;
 class Ui;
 
 class FindReplaceDialog : public QDialog {
@@ -21,8 +22,9 @@ class FindReplaceDialog : public QDialog {
  public:
   FindReplaceDialog(Ui& ui, QWidget* parent = nullptr);
 
-  // SET_Type: the text box searched.
+  // SET_Type: the text box searched, or the view of a large file.
   void setTarget(QPlainTextEdit* target);
+  void setTarget(LineView* target);
   void showFind();
   void showReplace();
   // HideShowReplace: a viewer cannot switch to replace mode.
@@ -33,15 +35,19 @@ class FindReplaceDialog : public QDialog {
   bool find();
   bool replace();
   int replaceAll();
+  // True while a search of a large file runs (its window must stay).
+  bool searching() const { return searching_; }
 
  private:
   bool selectionMatches(const QTextCursor& cursor) const;
   QTextCursor search(const QTextCursor& cursor) const;
   bool findNext();
+  bool findInView();
   void setReplaceMode(bool on);
 
   Ui& ui_;
   QPointer<QPlainTextEdit> target_;
+  QPointer<LineView> view_;
   QLineEdit* findText_;
   QLineEdit* replaceText_;
   QLabel* replaceLabel_;
@@ -51,6 +57,7 @@ class FindReplaceDialog : public QDialog {
   QPushButton* replaceButton_;
   QPushButton* replaceAllButton_;
   QPushButton* showReplaceButton_;
+  bool searching_ = false;
 };
 
 }  // namespace zv

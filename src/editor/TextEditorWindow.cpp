@@ -13,15 +13,18 @@
 #include <QPrintPreviewDialog>
 #include <QPrinter>
 #include <QProgressDialog>
+#include <QStackedWidget>
 #include <QStatusBar>
 #include <QStringDecoder>
 #include <QTextBlock>
 #include <filesystem>
 
 #include "editor/FindReplaceDialog.h"
+#include "editor/LineView.h"
 #include "editor/PlanView.h"
 #include "platform/TextIo.h"
 #include "platform/Ui.h"
+#include "platform/qt/BackgroundRun.h"
 #include "platform/qt/Controls.h"
 #include "survey/Listing.h"
 
@@ -30,7 +33,9 @@ namespace zv {
 namespace {
 
 // Larger files would take minutes and gigabytes in a text box.
-constexpr qint64 kLargestFile = qint64{32} << 20;
+constexpr qint64 kLargestEdited = qint64{32} << 20;
+// A viewer shows larger files in a LineView.
+constexpr qint64 kLargestInTextBox = qint64{1} << 20;
 
 const char* kAskToSave = "Changes have been made.  Would you like to save them?";
 
@@ -70,7 +75,11 @@ TextEditorWindow::TextEditorWindow(Ui& ui, QWidget* parent) : QMainWindow(parent
   QFont mono("Monospace");
   mono.setStyleHint(QFont::TypeWriter);
   text_->setFont(mono);
-  setCentralWidget(text_);
+  view_ = new LineView(this);
+  pages_ = new QStackedWidget(this);
+  pages_->addWidget(text_);
+  pages_->addWidget(view_);
+  setCentralWidget(pages_);
 
   QStatusBar* bar = statusBar();
   bar->setObjectName("sbrTextEditor");
@@ -85,6 +94,7 @@ TextEditorWindow::TextEditorWindow(Ui& ui, QWidget* parent) : QMainWindow(parent
   connect(text_, &QPlainTextEdit::textChanged, this, [this] { changed_ = true; });
   connect(text_, &QPlainTextEdit::cursorPositionChanged, this, &TextEditorWindow::updateStatus);
   connect(text_, &QPlainTextEdit::selectionChanged, this, &TextEditorWindow::updateStatus);
+  connect(view_, &LineView::caretMoved, this, &TextEditorWindow::updateStatus);
   resize(760, 560);
   setCaption("VORN Text Editor");
   updateStatus();
@@ -118,20 +128,23 @@ void TextEditorWindow::buildMenus() {
   add(
       edit, "mnuEditCut", "Cu&t", [this] { text_->cut(); }, QKeySequence::Cut);
   add(
-      edit, "mnuEditCopy", "&Copy", [this] { text_->copy(); }, QKeySequence::Copy);
+      edit, "mnuEditCopy", "&Copy", [this] { large_ ? view_->copy() : text_->copy(); },
+      QKeySequence::Copy);
   add(
       edit, "mnuEditPaste", "&Paste", [this] { text_->paste(); }, QKeySequence::Paste);
   add(edit, "mnuEditClear", "Cle&ar", &TextEditorWindow::editClear);
   edit->addSeparator();
   add(
-      edit, "mnuEditSelectAll", "Select A&ll", [this] { text_->selectAll(); },
-      QKeySequence::SelectAll);
+      edit, "mnuEditSelectAll", "Select A&ll",
+      [this] { large_ ? view_->selectAll() : text_->selectAll(); }, QKeySequence::SelectAll);
   edit->addSeparator();
   add(edit, "mnuEditFind", "&Find...", &TextEditorWindow::showFind, QKeySequence::Find);
   add(edit, "mnuEditReplace", "&Replace...", &TextEditorWindow::showReplace, QKeySequence::Replace);
-  text_->setContextMenuPolicy(Qt::CustomContextMenu);
-  connect(text_, &QWidget::customContextMenuRequested, this,
-          [this, edit](const QPoint& at) { edit->exec(text_->mapToGlobal(at)); });
+  for (QWidget* box : {static_cast<QWidget*>(text_), static_cast<QWidget*>(view_)}) {
+    box->setContextMenuPolicy(Qt::CustomContextMenu);
+    connect(box, &QWidget::customContextMenuRequested, this,
+            [box, edit](const QPoint& at) { edit->exec(box->mapToGlobal(at)); });
+  }
 
   viewMenu_ = menuBar()->addMenu("&View");
   viewMenu_->setObjectName("mnuView");
@@ -145,7 +158,7 @@ void TextEditorWindow::buildMenus() {
   viewMenu_->menuAction()->setVisible(false);
 }
 
-bool TextEditorWindow::showTextEditor(const QString& path, const QString& typeText, bool viewOnly) {
+void TextEditorWindow::setViewOnly(bool viewOnly) {
   viewOnly_ = viewOnly;
   text_->setReadOnly(viewOnly);
   for (const char* name :
@@ -157,6 +170,18 @@ bool TextEditorWindow::showTextEditor(const QString& path, const QString& typeTe
     }
   }
   if (find_) find_->hideShowReplace(viewOnly);
+}
+
+void TextEditorWindow::showLargeFile(bool large) {
+  large_ = large;
+  if (!large) view_->close();
+  pages_->setCurrentWidget(large ? static_cast<QWidget*>(view_) : text_);
+  if (find_) large ? find_->setTarget(view_) : find_->setTarget(text_);
+  updateStatus();
+}
+
+bool TextEditorWindow::showTextEditor(const QString& path, const QString& typeText, bool viewOnly) {
+  setViewOnly(viewOnly);
   filter_ = EditorFilter(typeText);
   viewMenu_->menuAction()->setVisible(HasListingViews(path));
   recordView_ = false;
@@ -169,10 +194,10 @@ bool TextEditorWindow::showTextEditor(const QString& path, const QString& typeTe
 }
 
 void TextEditorWindow::showNew(const QString& typeText) {
-  viewOnly_ = false;
-  text_->setReadOnly(false);
+  setViewOnly(false);
   filter_ = EditorFilter(typeText);
   path_.clear();
+  showLargeFile(false);
   text_->clear();
   changed_ = false;
   setCaption("VORN Text Editor");
@@ -181,7 +206,7 @@ void TextEditorWindow::showNew(const QString& typeText) {
 FindReplaceDialog* TextEditorWindow::findDialog() {
   if (!find_) {
     find_ = new FindReplaceDialog(ui_, this);
-    find_->setTarget(text_);
+    large_ ? find_->setTarget(view_) : find_->setTarget(text_);
     find_->hideShowReplace(viewOnly_);
   }
   return find_;
@@ -192,7 +217,9 @@ void TextEditorWindow::setCaption(const QString& prefix) {
 }
 
 bool TextEditorWindow::load(const QString& path) {
+  if (find_ && find_->searching()) return false;  // the view is being read
   if (path.isEmpty()) {
+    showLargeFile(false);
     text_->clear();
     return true;
   }
@@ -201,12 +228,24 @@ bool TextEditorWindow::load(const QString& path) {
     ui_.exclaim("The file '" + Std(path) + "' doesn't exist.");
     return false;
   }
-  if (file.size() > kLargestFile) {
-    ui_.exclaim("The file '" + Std(path) + "' is too large to be shown here (" +
-                std::to_string(file.size() >> 20) + " MB; at most " +
-                std::to_string(kLargestFile >> 20) + " MB).");
-    return false;
+  if (!viewOnly_ && file.size() > kLargestEdited) {
+    ui_.inform("The file '" + Std(path) + "' is too large to be edited here (" +
+               std::to_string(file.size() >> 20) + " MB; at most " +
+               std::to_string(kLargestEdited >> 20) + " MB).  It is opened for viewing only.");
+    setViewOnly(true);
   }
+  if (viewOnly_ && file.size() > kLargestInTextBox) {
+    QString error;
+    if (!view_->open(path, error)) {
+      ui_.exclaim("The file '" + Std(path) + "' could not be read: " + Std(error) + ".");
+      return false;
+    }
+    text_->clear();
+    showLargeFile(true);
+    changed_ = false;
+    return true;
+  }
+  showLargeFile(false);
   QByteArray bytes = file.readAll();
   // CR LF pairs become single line breaks; other bytes stay.
   qsizetype kept = 0;
@@ -258,6 +297,12 @@ void TextEditorWindow::setText(const QString& text) {
 }
 
 bool TextEditorWindow::writeText(const QString& path) {
+  if (large_) {
+    std::string error;
+    const bool ok = view_->write(Std(path), error);
+    if (!ok) ui_.exclaim(Std(WriteError(path, error)));
+    return ok;
+  }
   const QByteArray bytes =
       latin1_ ? text_->toPlainText().toLatin1() : text_->toPlainText().toUtf8();
   TextFileWriter writer(Std(path));
@@ -282,6 +327,10 @@ bool TextEditorWindow::askToSave() {
 }
 
 void TextEditorWindow::closeEvent(QCloseEvent* event) {
+  if (find_ && find_->searching()) {
+    event->ignore();
+    return;
+  }
   if (changed_) {
     // Cancel, or a save that did not happen, keeps the window and its text.
     Answer a = ui_.message(kAskToSave, Icon::None, Buttons::YesNoCancel, kAppTitle);
@@ -297,6 +346,7 @@ void TextEditorWindow::closeEvent(QCloseEvent* event) {
 void TextEditorWindow::fileNew() {
   if (!askToSave()) return;
   path_.clear();
+  showLargeFile(false);
   text_->clear();
   changed_ = false;
   viewMenu_->menuAction()->setVisible(false);
@@ -348,7 +398,7 @@ bool TextEditorWindow::fileSaveAs() {
 void TextEditorWindow::printTo(QPrinter& printer) {
   printer.setFullPage(true);  // margins measured from the paper's edge
   printer.setPageMargins(QMarginsF(1, 1, 1, 1), QPageLayout::Inch);
-  text_->print(&printer);
+  large_ ? view_->printTo(printer) : text_->print(&printer);
 }
 
 void TextEditorWindow::filePrint() {
@@ -404,7 +454,7 @@ bool TextEditorWindow::showRecordView() {
   const QString record = QString::fromStdString(stem + ".rec");
   if (!writeText(list)) return false;
   std::string error;
-  const bool ok = ConvertListToRecord(Std(list), Std(record), error);
+  const bool ok = convert([&] { return ConvertListToRecord(Std(list), Std(record), error); });
   std::error_code ec;
   std::filesystem::remove(Std(list), ec);
   if (!ok) {
@@ -425,7 +475,7 @@ bool TextEditorWindow::showListView() {
   const QString list = QString::fromStdString(stem + ".lst");
   if (!writeText(record)) return false;
   std::string error;
-  const bool ok = ConvertRecordToList(Std(record), Std(list), error);
+  const bool ok = convert([&] { return ConvertRecordToList(Std(record), Std(list), error); });
   std::error_code ec;
   std::filesystem::remove(Std(record), ec);
   if (!ok) {
@@ -438,10 +488,22 @@ bool TextEditorWindow::showListView() {
   return true;
 }
 
+bool TextEditorWindow::convert(const std::function<bool()>& work) {
+  return large_ ? RunInBackground(this, "Converting...", work) : work();
+}
+
 void TextEditorWindow::updateStatus() {
-  const QTextCursor c = text_->textCursor();
-  lineLabel_->setText("Line Number: " + QString::number(c.blockNumber() + 1));
-  columnLabel_->setText("Column Number: " + QString::number(c.positionInBlock() + 1));
+  qint64 line = 0, column = 0;
+  if (large_) {
+    line = view_->caret().line;
+    column = view_->caret().column;
+  } else {
+    const QTextCursor c = text_->textCursor();
+    line = c.blockNumber();
+    column = c.positionInBlock();
+  }
+  lineLabel_->setText("Line Number: " + QString::number(line + 1));
+  columnLabel_->setText("Column Number: " + QString::number(column + 1));
 }
 
 QWidget* OpenTextEditor(Ui& ui, const std::string& path, const std::string& type, EditorMode mode) {

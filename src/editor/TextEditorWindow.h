@@ -2,20 +2,25 @@
 // frmTextEditor: a plain-text editor window, opened as a viewer (read-only,
 // editing menus hidden) or as an editor. For VORN tagged files its View menu
 // switches between the list view (the file itself) and the record view.
+// A viewer shows a file over 1 MB in a LineView (any size, at once); an
+// editor takes files up to 32 MB and opens larger ones as a viewer.
 
 #include <QMainWindow>
 #include <QPointer>
 #include <QString>
+#include <functional>
 
 class QAction;
 class QLabel;
 class QMenu;
 class QPlainTextEdit;
 class QPrinter;
+class QStackedWidget;
 
 namespace zv {
 
 class FindReplaceDialog;
+class LineView;
 class Ui;
 enum class EditorMode;
 
@@ -37,6 +42,9 @@ class TextEditorWindow : public QMainWindow {
   bool changed() const { return changed_; }
   bool viewOnly() const { return viewOnly_; }
   QPlainTextEdit* textBox() const { return text_; }
+  LineView* lineView() const { return view_; }
+  // True when the file is shown by lineView() instead of the text box.
+  bool showsLargeFile() const { return large_; }
   FindReplaceDialog* findDialog();
 
   // Renders the whole text onto the printer's pages, one-inch margins.
@@ -62,6 +70,8 @@ class TextEditorWindow : public QMainWindow {
  private:
   void buildMenus();
   bool load(const QString& path);
+  void setViewOnly(bool viewOnly);
+  void showLargeFile(bool large);
   void setText(const QString& text);
   bool writeText(const QString& path);
   // Asks to save changes; false when the operation must not go on.
@@ -70,10 +80,14 @@ class TextEditorWindow : public QMainWindow {
   void setCaption(const QString& prefix);
   bool showRecordView();
   bool showListView();
+  // A listing conversion, off the GUI thread for a large file.
+  bool convert(const std::function<bool()>& work);
   void setViewChecks();
 
   Ui& ui_;
+  QStackedWidget* pages_;
   QPlainTextEdit* text_;
+  LineView* view_;
   QLabel* lineLabel_;
   QLabel* columnLabel_;
   QMenu* viewMenu_;
@@ -85,6 +99,7 @@ class TextEditorWindow : public QMainWindow {
   bool viewOnly_ = false;
   bool changed_ = false;
   bool recordView_ = false;
+  bool large_ = false;
   bool latin1_ = false;  // the file was not UTF-8: written back byte for byte
 };
 

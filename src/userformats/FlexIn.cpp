@@ -207,6 +207,18 @@ bool ReadFlexInStream(Ui& ui, std::istream& in, const std::string& path, const F
   SurveyPoint point;
   ResetPoint(point);
 
+  // The size of the input: once the first lines show how long a line is,
+  // the list makes room for all points at once (growing a list of a million
+  // points step by step copies it and touches twice the memory).
+  std::streamoff remaining = -1;
+  if (const std::streampos here = in.tellg(); here != std::streampos(-1)) {
+    if (in.seekg(0, std::ios::end)) remaining = in.tellg() - here;
+    in.clear();
+    in.seekg(here);
+  }
+  constexpr size_t kSampleLines = 1000;
+  size_t sampleBytes = 0;
+
   LineReader lines(in, ui.progress());
   if (lines.isUtf16()) {
     ui.exclaim(Utf16Refusal(path), kUtf16Title);
@@ -216,6 +228,13 @@ bool ReadFlexInStream(Ui& ui, std::istream& in, const std::string& path, const F
   size_t lineNo = 0;
   while (lines.next(line)) {
     ++lineNo;
+    if (lineNo <= kSampleLines) {
+      sampleBytes += line.size() + 1;
+      if (lineNo == kSampleLines && remaining > 0) {
+        const double perLine = static_cast<double>(sampleBytes) / kSampleLines;
+        list.reserve(static_cast<size_t>(static_cast<double>(remaining) / perLine * 1.02) + 16);
+      }
+    }
     // Lines of blanks only hold no data; they are skipped like empty lines.
     if (IsBlankText(line)) continue;
     if (!format.headerPrefix.empty() && line.starts_with(format.headerPrefix)) {

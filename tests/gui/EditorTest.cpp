@@ -3,6 +3,7 @@
 #include <QAction>
 #include <QApplication>
 #include <QCheckBox>
+#include <QClipboard>
 #include <QLabel>
 #include <QLineEdit>
 #include <QMenu>
@@ -11,9 +12,11 @@
 #include <QPrinter>
 #include <QPushButton>
 #include <QTest>
+#include <QTextBlock>
 #include <filesystem>
 
 #include "editor/FindReplaceDialog.h"
+#include "editor/LineView.h"
 #include "editor/TextEditorWindow.h"
 #include "platform/ScriptedUi.h"
 #include "support/Boxes.h"
@@ -88,17 +91,23 @@ TEST_F(EditorTest, MissingFileIsReportedAndStatusBarFollowsTheCaret) {
                                      "Out File (*.OUT)", false));
   EXPECT_EQ(Take(ui), "E VORN Zurevazidu: The file '" + dir.file("gone.OUT") + "' doesn't exist.");
   // Opened as a window of its own, a file that cannot be shown leaves none behind.
+  EXPECT_EQ(OpenTextEditor(ui, dir.file("gone.OUT"), "Out File (*.OUT)", EditorMode::Viewer),
+            nullptr);
+  QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  for (QWidget* w : QApplication::topLevelWidgets())
+    EXPECT_FALSE(qobject_cast<TextEditorWindow*>(w) && w->isVisible() && w != &editor);
+  EXPECT_EQ(Take(ui), "E VORN Zurevazidu: The file '" + dir.file("gone.OUT") + "' doesn't exist.");
+  // Too large to edit: said so, and shown for viewing.
   const std::string large = dir.write("large.CTL", "");
   std::filesystem::resize_file(large, (std::uintmax_t{33} << 20) + 1);
-  for (const std::string& path : {dir.file("gone.OUT"), large}) {
-    EXPECT_EQ(OpenTextEditor(ui, path, "Out File (*.OUT)", EditorMode::Viewer), nullptr);
-    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-    for (QWidget* w : QApplication::topLevelWidgets())
-      EXPECT_FALSE(qobject_cast<TextEditorWindow*>(w) && w->isVisible() && w != &editor) << path;
-  }
-  EXPECT_EQ(Take(ui), "E VORN Zurevazidu: The file '" + dir.file("gone.OUT") +
-                          "' doesn't exist.\nE VORN Zurevazidu: The file '" + large +
-                          "' is too large to be shown here (33 MB; at most 32 MB).");
+  auto* opened = qobject_cast<TextEditorWindow*>(
+      OpenTextEditor(ui, large, "VORN Control Files (*.CTL)", EditorMode::Editor));
+  ASSERT_NE(opened, nullptr);
+  EXPECT_TRUE(opened->viewOnly() && opened->showsLargeFile());
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: The file '" + large +
+                          "' is too large to be edited here (33 MB; at most 32 MB).  It is "
+                          "opened for viewing only.");
+  opened->close();
   EXPECT_FALSE(text()->isReadOnly());
 
   text()->setPlainText("first\nsecond line\nthird");
@@ -140,7 +149,8 @@ TEST_F(EditorTest, ReplaceAndReplaceAllCountWhatTheyChanged) {
   EXPECT_EQ(text()->toPlainText(), "FE:OAK\nFE:POLE\nFE:OAK\n");
   EXPECT_EQ(Take(ui), "I VORN Zurevazidu: Search String Not Found.");
 
-  // A replacement holding the search text is not replaced again.
+  // A replacement holding the search text is not replaced again; undo takes
+  // back the whole Replace All.
   caretAt(5);
   d = find("OAK", "OAK TREE OAK");
   EXPECT_EQ(d->replaceAll(), 2);
@@ -148,12 +158,22 @@ TEST_F(EditorTest, ReplaceAndReplaceAllCountWhatTheyChanged) {
   EXPECT_EQ(Take(ui).substr(1), " VORN Zurevazidu: Replaced 'OAK' with 'OAK TREE OAK' 2 time(s).");
   EXPECT_EQ(text()->textCursor().position(), 5);
   EXPECT_TRUE(editor.changed());
+  text()->undo();
+  EXPECT_EQ(text()->toPlainText(), "FE:OAK\nFE:POLE\nFE:OAK\n");
+  text()->redo();
 
   caretAt(9);
   d = find("ELM", "X");
   EXPECT_EQ(d->replaceAll(), 0);
   EXPECT_EQ(ui.onlyText(), "Replaced 'ELM' with 'X' 0 time(s).");
   EXPECT_EQ(text()->textCursor().position(), 9);
+
+  // Whole words: a part of a word is passed over, also just before a word.
+  text()->setPlainText(QString::fromUtf8("OAKS,OAK oak\xC2\xA0OAK"));
+  d = find("oak", "ELM");
+  d->findChild<QCheckBox*>("chkFRMatchWord")->setChecked(true);
+  EXPECT_EQ(d->replaceAll(), 3);
+  EXPECT_EQ(text()->toPlainText(), "OAKS,ELM ELM ELM");
 }
 
 TEST_F(EditorTest, SavingWritesCrLfAndTheQuestionGuardsChanges) {
@@ -234,6 +254,97 @@ TEST_F(EditorTest, RecordAndListViewsRoundTripThroughTheirWorkingFiles) {
   EXPECT_EQ(editor.path(), QString::fromStdString(path + ".lst"));
   EXPECT_FALSE(std::filesystem::exists(path + ".rec"));
   EXPECT_EQ(ReadFile(path), control);
+}
+
+// About 1.4 MB: more than a viewer's text box takes.
+std::string LargeControlFile(int records) {
+  std::string text;
+  for (int i = 0; i < records; ++i) {
+    text.append("AC:OS\r\nPN:").append(std::to_string(i)).append("\r\nPD:OAK\r\n");
+  }
+  return text.append("PD:Tree treetop\r\nPD:TREE");  // no end on the last line
+}
+
+TEST_F(EditorTest, ViewerShowsALargeFileFindsInItAndSwitchesItsViews) {
+  constexpr int kRecords = 70000;
+  const std::string path = dir.write("big.CTL", LargeControlFile(kRecords));
+  ASSERT_TRUE(
+      editor.showTextEditor(QString::fromStdString(path), "VORN Control Files (*.CTL)", true));
+  ASSERT_TRUE(editor.showsLargeFile());
+  LineView* view = editor.lineView();
+  EXPECT_EQ(view->lineText(1), "PN:0");
+  view->finishIndex();
+  const qint64 last = 3 * kRecords + 1;
+  EXPECT_EQ(view->lineCount(), last + 1);
+  EXPECT_EQ(status("Line") + " " + status("Column"), "Line Number: 1 Column Number: 1");
+
+  // Find goes through the whole file; where each find leaves the selection.
+  FindReplaceDialog* d = find("tree");
+  auto next = [&] {
+    if (!d->find()) return std::string("none");
+    return std::to_string(view->caret().line) + ":" + std::to_string(view->anchor().column) + "-" +
+           std::to_string(view->caret().column);
+  };
+  const std::string atTree = std::to_string(last - 1) + ":3-7";
+  const std::string atTreetop = std::to_string(last - 1) + ":8-12";
+  const std::string atTREE = std::to_string(last) + ":3-7";
+  EXPECT_EQ((std::vector{next(), next(), next()}), (std::vector{atTree, atTreetop, atTREE}));
+  EXPECT_EQ(status("Line") + " " + status("Column"),
+            QString("Line Number: %1 Column Number: 8").arg(last + 1));
+  EXPECT_EQ(view->selectedText(), "TREE");
+  EXPECT_EQ(next(), "none");
+  EXPECT_EQ(Take(ui), "I VORN Zurevazidu: Search String Not Found.");
+  d->findChild<QCheckBox*>("chkFRMatchWord")->setChecked(true);
+  view->setSelection({}, {});
+  EXPECT_EQ((std::vector{next(), next()}), (std::vector{atTree, atTREE}));
+  d->findChild<QCheckBox*>("chkFRMatchCase")->setChecked(true);
+  view->setSelection({}, {});
+  EXPECT_EQ(next(), "none");
+  ui.boxes.clear();
+
+  // Save As writes every line with CR LF.
+  ui.files.push_back(dir.file("copy.CTL"));
+  ASSERT_TRUE(editor.fileSaveAs());
+  EXPECT_EQ(ReadFile(dir.file("copy.CTL")), LargeControlFile(kRecords) + "\r\n");
+
+  // The record view and back.
+  editor.viewRecord();
+  EXPECT_TRUE(ui.boxes.empty()) << ui.onlyText();
+  EXPECT_EQ(editor.path(), QString::fromStdString(dir.file("copy.CTL.rec")));
+  const QString record =
+      editor.showsLargeFile() ? view->lineText(2) : text()->document()->findBlockByNumber(2).text();
+  EXPECT_EQ(record, "AC:OS  PN:1  PD:OAK");
+  editor.viewList();
+  ASSERT_TRUE(editor.showsLargeFile());
+  view->finishIndex();
+  EXPECT_EQ(view->lineCount(), last + 1);
+  EXPECT_EQ(view->lineText(last), "PD:TREE");
+}
+
+TEST_F(EditorTest, LargeFileViewMovesTheCaretWithTheKeysAndCopiesTheSelection) {
+  LineView view;
+  QString error;
+  ASSERT_TRUE(
+      view.open(QString::fromStdString(dir.write("t.OUT", "PN:1\tA\r\nPD:long line\rX")), error));
+  auto at = [&] {
+    return std::to_string(view.caret().line) + ":" + std::to_string(view.caret().column);
+  };
+  std::vector<std::string> seen;
+  for (auto [key, modifiers] : {std::pair{Qt::Key_End, Qt::NoModifier},
+                                {Qt::Key_Down, Qt::NoModifier},
+                                {Qt::Key_Down, Qt::ShiftModifier},
+                                {Qt::Key_Right, Qt::ShiftModifier},
+                                {Qt::Key_Left, Qt::ShiftModifier}}) {
+    QTest::keyClick(&view, key, modifiers);
+    seen.push_back(at());
+  }
+  EXPECT_EQ(seen, (std::vector<std::string>{"0:6", "1:6", "2:1", "2:1", "2:0"}));
+  QTest::keyClick(&view, Qt::Key_Right, Qt::ShiftModifier);
+  view.copy();
+  EXPECT_EQ(QApplication::clipboard()->text(), "g line\nX");
+  QTest::keyClick(&view, Qt::Key_Home, Qt::ControlModifier);
+  EXPECT_EQ(at(), "0:0");
+  EXPECT_FALSE(view.hasSelection());
 }
 
 TEST_F(EditorTest, PrintsEveryPageToAPdf) {

@@ -1,11 +1,15 @@
 #include "app/dialogs/QtEngineDialogs.h"
 
 #include "app/AppContext.h"
+#include "coordui/CatalogEditorDialogs.h"
 #include "coordui/CoordinateConversionDialog.h"
 #include "coordui/CoordinateResultsDialog.h"
 #include "coordui/ManualEntryDialog.h"
 #include "platform/qt/BackgroundRun.h"
 #include "platform/qt/GuiThread.h"
+#include "tools/dialogs/GridToLocalDialog.h"
+#include "tools/dialogs/LocalToGridDialog.h"
+#include "userformats/dialogs/FlexDialogs.h"
 
 namespace zv {
 
@@ -22,6 +26,8 @@ bool QtEngineDialogs::coordinateConversion(AppContext& ctx, ConversionState& sta
     // The preset is copied: OK replaces the settings it came from.
     const ConversionSettings preset = state.settings;
     dialog.load(presetInput ? &preset : nullptr);
+    dialog.setCatalogEditor(
+        [&](CatalogKind kind) { OpenCatalogEditor(ctx.ui, ctx.appFolder, kind, &dialog); });
     dialog.exec();
     return state.accepted;
   });
@@ -40,6 +46,43 @@ void QtEngineDialogs::showReport(const std::string& report) {
     UserWait wait;
     CoordinateResultsDialog dialog(report, wait.owner());
     dialog.exec();
+  });
+}
+
+bool QtEngineDialogs::flexIn(AppContext& ctx, const std::string& path) {
+  return OnGuiThread([&] {
+    UserWait wait;
+    FlexInDialog dialog(ctx.ui, ctx.appFolder, ctx.work, *ctx.settings, path, wait.owner());
+    dialog.exec();
+    return dialog.succeeded();
+  });
+}
+
+bool QtEngineDialogs::flexOut(AppContext& ctx, const std::string& path) {
+  return OnGuiThread([&] {
+    UserWait wait;
+    FlexOutDialog dialog(ctx.ui, ctx.appFolder, ctx.work, *ctx.settings, path, wait.owner());
+    dialog.exec();
+    return dialog.succeeded();
+  });
+}
+
+bool QtEngineDialogs::gridToLocal(AppContext& ctx, const std::string& input,
+                                  const std::string& output, const GridToLocalRunner& run) {
+  return OnGuiThread([&] {
+    UserWait wait;
+    GridToLocalDialog dialog(ctx.ui, input, output, run, wait.owner());
+    return dialog.exec() == QDialog::Accepted;
+  });
+}
+
+bool QtEngineDialogs::localToGrid(AppContext& ctx, const RecordedGridReference& recorded,
+                                  const std::string& input, const std::string& output,
+                                  const LocalToGridRunner& run) {
+  return OnGuiThread([&] {
+    UserWait wait;
+    LocalToGridDialog dialog(ctx.ui, ctx.appFolder, recorded, input, output, run, wait.owner());
+    return dialog.exec() == QDialog::Accepted;
   });
 }
 

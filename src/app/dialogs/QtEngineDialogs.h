@@ -16,6 +16,12 @@ class QtEngineDialogs : public EngineDialogs {
   bool coordinateConversion(AppContext& ctx, ConversionState& state, bool presetInput) override;
   bool enterPoint(const ManualEntrySetup& setup, SurveyPoint& point) override;
   void showReport(const std::string& report) override;
+  bool flexIn(AppContext& ctx, const std::string& path) override;
+  bool flexOut(AppContext& ctx, const std::string& path) override;
+  bool gridToLocal(AppContext& ctx, const std::string& input, const std::string& output,
+                   const GridToLocalRunner& run) override;
+  bool localToGrid(AppContext& ctx, const RecordedGridReference& recorded, const std::string& input,
+                   const std::string& output, const LocalToGridRunner& run) override;
 
  private:
   Ui& ui_;
