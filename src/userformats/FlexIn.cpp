@@ -249,6 +249,8 @@ bool ReadFlexInStream(Ui& ui, std::istream& in, const std::string& path, const F
         size_t end = r + 1 < columns.size() ? columns[r + 1].start : line.size();
         std::string_view field;
         if (start < line.size()) field = line.substr(start, std::min(end, line.size()) - start);
+        // A text field is padded to its width: the blanks are not part of it.
+        if (columns[r].column && IsFlexTextColumn(*columns[r].column)) field = Trim(field);
         if (!reader.store(point, columns[r], field, lineNo)) return false;
       }
     } else {

@@ -100,14 +100,14 @@ TEST(FlexInRead, FieldsFollowTheDelimiterAndColumns) {
       {InFormat("Comma", pnezd),
        ReadFile(ZV_FIXTURES "/flex/comma-trailing-delimiters.csv"),
        {"1|100.5|200.25|10|IPF|P|||-|W", "2|101.5|201.25|-|CP|P|||-|W"}},
-      // Column-specific fields keep the blanks of text fields; a field may
-      // start beyond the end of its line.
+      // Column-specific text fields lose the blanks that pad them to their
+      // width; a field may start beyond the end of its line.
       {InFormat(kColumnSpecific, {"Point ID", "Northing", "Feature Code"}, {"1", "11", "25"}),
        CrLf({"AB        1234.5", "CD        99.25         TREE"}),
-       {"AB        |1234.5|-|-||P|||-|W", "CD        |99.25|-|-|TREE|P|||-|W"}},
+       {"AB|1234.5|-|-||P|||-|W", "CD|99.25|-|-|TREE|P|||-|W"}},
       {InFormat(kColumnSpecific, pnezd, {"1", "11", "25", "39", "49"}, "PRJ", "#"),
        ReadFile(ZV_FIXTURES "/flex/fixed-blank-fields.txt"),
-       {"BR-1      |5012.25|7020.5|-|TREE|P|||-|W", "BR-2      |5013|7021.125|812.33||P|||-|W"}},
+       {"BR-1|5012.25|7020.5|-|TREE|P|||-|W", "BR-2|5013|7021.125|812.33||P|||-|W"}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.text);
@@ -291,7 +291,7 @@ TEST_F(FlexInFile, StoredFormatIsUsedWhenNoneIsGiven) {
   c.format.reset();
   c.formatName = "office fixed";  // section names ignore letter case
   ASSERT_TRUE(FlexIn(ui, work, dir.path(), path, c)) << ui.onlyText();
-  EXPECT_EQ(Show(work.InputPoints.at(0)), "P-1     |5000.125|-|-||P|||-|W");
+  EXPECT_EQ(Show(work.InputPoints.at(0)), "P-1|5000.125|-|-||P|||-|W");
 
   c.formatName = "Gone";
   EXPECT_FALSE(FlexIn(ui, work, dir.path(), path, c));
