@@ -255,8 +255,7 @@ bool WriteExchangeAnswer(Ui& ui, const std::string& path, const ConversionState&
 
   // Lengths are answered in the output units whatever unit a step left
   // them in; a unit pair that does not convert leaves them as held.
-  auto length = [](std::string& line, double value, const std::string& from,
-                   const std::string& to) {
+  auto length = [](std::string& line, double value, std::string_view from, std::string_view to) {
     line += ',';
     if (value == kNoValue) return;
     double converted = Distances_Convert(value, from, to);
@@ -265,8 +264,8 @@ bool WriteExchangeAnswer(Ui& ui, const std::string& path, const ConversionState&
   auto single = [](float v) { return v == kNoValueF ? kNoValue : static_cast<double>(v); };
   for (const SurveyPoint& p : state.points) {
     std::string& line = out.buffer();
-    const std::string& hu = p.HorizontalUnits;
-    const std::string& vu = p.VerticalUnits;
+    std::string_view hu = p.HorizontalUnits;
+    std::string_view vu = p.VerticalUnits;
     line += p.PointName;
     length(line, p.Northing, hu, s.outputHorizontalUnits);
     length(line, p.Easting, hu, s.outputHorizontalUnits);

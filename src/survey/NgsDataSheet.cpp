@@ -40,10 +40,9 @@ bool IsSheetStart(std::string_view line) {
   return line.substr(0, kSheetStart.size()) == kSheetStart;
 }
 
-void AppendTagged(std::string& field, std::string_view prefix, std::string_view value) {
+void AppendTagged(CompactText& field, std::string_view prefix, std::string_view value) {
   if (!field.empty()) field += "\r\n";
-  field.append(prefix);
-  field.append(value);
+  field.append(prefix, value);
 }
 
 class NgsReader {

@@ -51,7 +51,7 @@ bool IsIntegerText(std::string_view token) {
 }
 
 // Adds a word to a description kept as one tagged line.
-void AddWords(std::string& field, std::string_view tag, std::string_view words) {
+void AddWords(CompactText& field, std::string_view tag, std::string_view words) {
   if (field.empty()) {
     field.append(tag);
   } else {
@@ -403,24 +403,29 @@ class SrvWriter {
   }
 
   void writeHeader(const FileHeader& header, const std::string& unitText) {
-    if (!header.ProjectLine.empty()) out_.line("#" + header.ProjectLine);
-    out_.line("#" + VersionLine());
+    if (!header.ProjectLine.empty()) commented("#", header.ProjectLine);
+    commented("#", VersionLine());
     std::string_view extra = header.HeaderExtraLines;
     while (!extra.empty()) {
       size_t end = extra.find("\r\n");
-      std::string& b = out_.buffer();
-      b += '#';
-      b.append(extra.substr(0, end));
-      out_.lineDone();
+      commented("#", extra.substr(0, end));
       if (end == std::string_view::npos) break;
       extra.remove_prefix(end + 2);
     }
-    if (!header.CoordinateSystem.empty()) out_.line("#CS:" + header.CoordinateSystem);
-    if (!header.Zone.empty()) out_.line("#ZN:" + header.Zone);
-    if (!header.HorizontalDatum.empty()) out_.line("#HD:" + header.HorizontalDatum);
+    if (!header.CoordinateSystem.empty()) commented("#CS:", header.CoordinateSystem);
+    if (!header.Zone.empty()) commented("#ZN:", header.Zone);
+    if (!header.HorizontalDatum.empty()) commented("#HD:", header.HorizontalDatum);
     if (!header.VerticalDatum.empty() && header.VerticalDatum != "None")
-      out_.line("#VD:" + header.VerticalDatum);
-    if (!unitText.empty()) out_.line("#UL:" + unitText);
+      commented("#VD:", header.VerticalDatum);
+    if (!unitText.empty()) commented("#UL:", unitText);
+  }
+
+  // A header line: its mark, then the text.
+  void commented(std::string_view mark, std::string_view text) {
+    std::string& b = out_.buffer();
+    b.append(mark);
+    b.append(text);
+    out_.lineDone();
   }
 
   std::string chainName(const SurveyChain& chain) {

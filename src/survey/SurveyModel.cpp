@@ -8,8 +8,8 @@
 namespace zv {
 
 void ResetPoint(SurveyPoint& point) {
-  std::string recordCode = std::move(point.RecordCode);
-  std::string text33 = std::move(point.Text33);
+  CompactText recordCode = std::move(point.RecordCode);
+  CompactText text33 = std::move(point.Text33);
   point = SurveyPoint{};
   point.RecordCode = std::move(recordCode);
   point.Text33 = std::move(text33);

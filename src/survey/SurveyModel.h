@@ -1,12 +1,14 @@
 #pragma once
 // The survey model: point, chain and header records and the work area that
-// readers fill and writers consume.
+// readers fill and writers consume. Point and chain texts are CompactText
+// fields (eight bytes each), so that a million points stay near 250 MB.
 
 #include <cstdint>
 #include <istream>
 #include <string>
 #include <vector>
 
+#include "platform/CompactText.h"
 #include "platform/Numbers.h"
 
 namespace zv {
@@ -16,57 +18,58 @@ namespace zv {
 inline constexpr const char* kGeographicCoordinates = "Geographic Coordinates";
 
 struct SurveyPoint {
-  std::string PointName;
-  std::string Text2;  // not used by the survey formats; carried through
-  std::string Geometry = "P";
-  std::string CodeLetter;
-  std::string FeatureCode;
-  std::string IntegerAttribute;
-  std::string Text7;
-  std::string DescriptionLines;  // whole "PD:" lines joined by CR LF
+  CompactText PointName;
+  CompactText Text2;  // not used by the survey formats; carried through
+  CompactText Geometry = "P";
+  CompactText CodeLetter;
+  CompactText FeatureCode;
+  CompactText IntegerAttribute;
+  CompactText Text7;
+  CompactText DescriptionLines;  // whole "PD:" lines joined by CR LF
   double Northing = kNoValue;
   double Easting = kNoValue;
   double Elevation = kNoValue;
   float NorthingError = kNoValueF;
   float EastingError = kNoValueF;
   float ElevationError = kNoValueF;
+  // The flags fill the gap after the three floats.
+  bool GridMissing = false;
+  bool NotYetWritten = true;
+  bool HorizontalIsControl = false;
+  bool ElevationIsControl = false;
   double Latitude = kNoValue;
   double Longitude = kNoValue;
   double EllipsoidHeight = kNoValue;
   double GeoidHeight = kNoValue;
-  std::string Text19;
+  CompactText Text19;
   double Convergence = kNoValue;
   double ScaleFactor = kNoValue;
-  bool GridMissing = false;
-  std::string ExtraLines;  // whole lines with unknown tags, joined by CR LF
-  bool NotYetWritten = true;
-  bool HorizontalIsControl = false;
-  bool ElevationIsControl = false;
-  std::string Text27;
-  std::string HorizontalUnits;
-  std::string VerticalUnits;
-  std::string LatitudeHemisphere = "N";
-  std::string LongitudeHemisphere = "W";
-  std::string RecordCode;  // kept by ResetPoint
-  std::string Text33;      // kept by ResetPoint
-  std::string GRText;
+  CompactText ExtraLines;  // whole lines with unknown tags, joined by CR LF
+  CompactText Text27;
+  CompactText HorizontalUnits;
+  CompactText VerticalUnits;
+  CompactText LatitudeHemisphere = "N";
+  CompactText LongitudeHemisphere = "W";
+  CompactText RecordCode;  // kept by ResetPoint
+  CompactText Text33;      // kept by ResetPoint
+  CompactText GRText;
 };
 
 // Sets every field to its initial value except RecordCode and Text33.
 void ResetPoint(SurveyPoint& point);
 
 struct SurveyChain {
-  std::string ChainName;
-  std::string CodeLetter;
-  std::string IntegerAttribute;
-  std::string FeatureCode;
-  std::string Description;  // whole "CD:" lines joined by CR LF
-  std::string FGText;
-  std::string PointListLines;  // whole "PL:" lines joined by CR LF
-  std::string ChainLines;      // whole "CH:" lines joined by CR LF
-  std::string ExtraLines;
+  CompactText ChainName;
+  CompactText CodeLetter;
+  CompactText IntegerAttribute;
+  CompactText FeatureCode;
+  CompactText Description;  // whole "CD:" lines joined by CR LF
+  CompactText FGText;
+  CompactText PointListLines;  // whole "PL:" lines joined by CR LF
+  CompactText ChainLines;      // whole "CH:" lines joined by CR LF
+  CompactText ExtraLines;
   bool Open = false;
-  std::string Station;
+  CompactText Station;
 };
 
 // Clears the text fields of a chain and sets Open.

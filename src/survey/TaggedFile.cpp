@@ -315,8 +315,10 @@ class TaggedReader {
   // Text33 carry over.
   void finishPoint() {
     SurveyPoint& p = points_.back();
-    p.HorizontalUnits = header_.HorizontalUnits;
-    p.VerticalUnits = header_.VerticalUnits;
+    if (horizontalUnits_ != header_.HorizontalUnits) horizontalUnits_ = header_.HorizontalUnits;
+    if (verticalUnits_ != header_.VerticalUnits) verticalUnits_ = header_.VerticalUnits;
+    p.HorizontalUnits = horizontalUnits_;
+    p.VerticalUnits = verticalUnits_;
   }
   void storePoint() {
     finishPoint();
@@ -339,7 +341,7 @@ class TaggedReader {
 
   // Chain lines outside a chain section are kept as unknown lines rather
   // than collected into a chain that is never stored.
-  void chainLine(std::string& field, std::string_view line) {
+  void chainLine(CompactText& field, std::string_view line) {
     if (inChain_) {
       AppendLine(field, line);
     } else {
@@ -402,7 +404,8 @@ class TaggedReader {
 
   std::int64_t lineNumber_ = 0;
   FileHeader header_;
-  std::vector<SurveyPoint> points_;  // the last one is the working point
+  CompactText horizontalUnits_, verticalUnits_;  // the header's, shared by the points
+  std::vector<SurveyPoint> points_;              // the last one is the working point
   std::vector<SurveyChain> chains_;
   SurveyChain chain_;
   bool inProject_ = false;
@@ -433,7 +436,7 @@ const char* UnitCode(std::string_view unit) {
 }
 
 // True when values in `from` can be expressed in `to`.
-bool Convertible(const std::string& from, const std::string& to) {
+bool Convertible(std::string_view from, std::string_view to) {
   return from == to || Distances_Convert(1.0, from, to) != kNoValue;
 }
 
@@ -447,7 +450,7 @@ class TaggedWriter {
  public:
   TaggedWriter(Ui& ui, TextFileWriter& out, const TaggedFormat& format, const WorkArea& work,
                std::string unit)
-      : ui_(ui), out_(out), format_(format), unit_(std::move(unit)) {
+      : ui_(ui), out_(out), format_(format), unit_(unit) {
     bool all = !work.ConversionOptionsActive;
     latLong_ = all || work.OutputLatLong;
     convergence_ = all || work.OutputConvergence;
@@ -545,7 +548,7 @@ class TaggedWriter {
   // keeps its unit) rather than turning into the no-value marker.
   void convert(SurveyPoint& p) {
     if (Convertible(p.HorizontalUnits, unit_)) {
-      const std::string& from = p.HorizontalUnits;
+      std::string_view from = p.HorizontalUnits;
       p.Northing = Distances_Convert(p.Northing, from, unit_);
       p.Easting = Distances_Convert(p.Easting, from, unit_);
       p.NorthingError = ToSingle(Distances_Convert(p.NorthingError, from, unit_));
@@ -554,7 +557,7 @@ class TaggedWriter {
       if (p.HorizontalUnits != unit_) p.HorizontalUnits = unit_;
     }
     if (Convertible(p.VerticalUnits, unit_)) {
-      const std::string& from = p.VerticalUnits;
+      std::string_view from = p.VerticalUnits;
       p.Elevation = Distances_Convert(p.Elevation, from, unit_);
       p.EllipsoidHeight = Distances_Convert(p.EllipsoidHeight, from, unit_);
       p.GeoidHeight = Distances_Convert(p.GeoidHeight, from, unit_);
@@ -562,7 +565,7 @@ class TaggedWriter {
     }
   }
 
-  void angle(const char* tag, double& value, std::string& hemisphere, const char* to) {
+  void angle(const char* tag, double& value, CompactText& hemisphere, const char* to) {
     double v = Angles_ConvertHemisphere(value, hemisphere, to);
     if (v == kNoValue) return;
     value = v;
@@ -592,7 +595,7 @@ class TaggedWriter {
   Ui& ui_;
   TextFileWriter& out_;
   const TaggedFormat& format_;
-  std::string unit_;
+  CompactText unit_;  // shared by the converted points
   bool latLong_;
   bool convergence_;
   bool scaleFactor_;
@@ -620,7 +623,7 @@ bool ReadTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const Tagge
 bool WriteTaggedFile(Ui& ui, WorkArea& work, const std::string& path, const TaggedFormat& format) {
   FileHeader& h = work.OutputHeader;
   std::string unit = h.HorizontalUnits.starts_with("DDD") ? h.VerticalUnits : h.HorizontalUnits;
-  if (const char* code = UnitCode(unit)) h.HorizontalUnits = code;
+  if (const char* code = UnitCode(unit)) h.HorizontalUnits = std::string(code);
 
   TextFileWriter out(path);
   if (!out.open()) {

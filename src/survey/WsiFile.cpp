@@ -29,10 +29,9 @@ std::string_view Cols(std::string_view line, size_t first, size_t last) {
   return line.substr(first - 1, last - first + 1);
 }
 
-void AppendTagged(std::string& field, std::string_view prefix, std::string_view value) {
+void AppendTagged(CompactText& field, std::string_view prefix, std::string_view value) {
   if (!field.empty()) field += "\r\n";
-  field.append(prefix);
-  field.append(value);
+  field.append(prefix, value);
 }
 
 // A length in `unit` to metres. A point without a unit name is taken as it
@@ -274,7 +273,7 @@ class WsiWriter {
     std::unordered_map<std::string_view, size_t> index;
     std::vector<SurveyPoint>& points = work_.OutputPoints;
     for (size_t i = 0; i < points.size(); ++i) {
-      const std::string& name = points[i].GRText;
+      std::string_view name = points[i].GRText;
       if (name.empty()) {
         unnamed.push_back(i);
         continue;
@@ -412,6 +411,13 @@ std::string TakeTaggedLine(std::string& text, std::string_view tag, bool wholeLi
     pos = end + 2;
   }
   if (remove && found) text = std::move(kept);
+  return result;
+}
+
+std::string TakeTaggedLine(CompactText& text, std::string_view tag, bool wholeLine, bool remove) {
+  std::string all = text;
+  std::string result = TakeTaggedLine(all, tag, wholeLine, remove);
+  if (all.size() != text.size()) text = all;
   return result;
 }
 

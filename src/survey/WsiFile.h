@@ -23,5 +23,6 @@ bool WriteWsiFile(Ui& ui, WorkArea& work, const std::string& path);
 // line, or the line from its fourth character on. With `remove` every such
 // line is taken out of `text`. An empty text or tag gives "".
 std::string TakeTaggedLine(std::string& text, std::string_view tag, bool wholeLine, bool remove);
+std::string TakeTaggedLine(CompactText& text, std::string_view tag, bool wholeLine, bool remove);
 
 }  // namespace zv

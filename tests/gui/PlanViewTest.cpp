@@ -69,7 +69,10 @@ std::vector<std::uint32_t> Sources(const PlanModel& m, const std::vector<std::ui
 // A square lattice of n x n points one unit apart, from (0, 0).
 PlanModel Lattice(int n) {
   std::vector<SurveyPoint> points;
-  for (int i = 0; i < n * n; ++i) points.push_back(Grid("P" + std::to_string(i), i % n, i / n));
+  for (int i = 0; i < n * n; ++i) {
+    std::string name = "P";
+    points.push_back(Grid(name.append(std::to_string(i)), i % n, i / n));
+  }
   return PlanModel::Build(Header("State Plane 1983"), points, {});
 }
 
