@@ -416,7 +416,7 @@ const char* PanelCaption(ZoneField f) {
     case ZoneField::CentralLongitude:
       return "Central Lon&gitude:";
     case ZoneField::FalseNorthing:
-      return "False &Northing:";
+      return "False Nor&thing:";
     case ZoneField::FalseEasting:
       return "False &Easting:";
     case ZoneField::ScaleFactor:
@@ -474,7 +474,7 @@ ZoneEditorDialog::ZoneEditorDialog(Ui& ui, const std::string& appFolder, ZoneImp
                bind_->list(this, "cmbZonesEllipsoid", F::Ellipsoid, choices(F::Ellipsoid)));
   form->addRow("&Vertical Datum:",
                bind_->list(this, "cmbZonesVDatum", F::VerticalDatum, choices(F::VerticalDatum)));
-  form->addRow("&Projection:",
+  form->addRow("Pro&jection:",
                bind_->list(this, "cmbZonesProjection", F::Projection, choices(F::Projection)));
   auto* flags = new QHBoxLayout;
   flags->addWidget(bind_->check(this, "chkZonesShowIn", "Show &In", F::ShowIn));
@@ -517,7 +517,7 @@ ZoneEditorDialog::ZoneEditorDialog(Ui& ui, const std::string& appFolder, ZoneImp
 
   QLayout* buttons = makeButtons("Zones");
   if (importer_) {
-    QPushButton* importButton = MakeButton(this, "cmdZonesImport", "Import from EPS&G...");
+    QPushButton* importButton = MakeButton(this, "cmdZonesImport", "I&mport from EPSG...");
     connect(importButton, &QPushButton::clicked, this, &ZoneEditorDialog::import);
     static_cast<QHBoxLayout*>(buttons)->insertWidget(2, importButton);
   }

@@ -108,7 +108,7 @@ CoordinateConversionDialog::CoordinateConversionDialog(Ui& ui, std::string appFo
   editDatums_ = radio("optConvertFDatums", "&Datums");
   editEllipsoids_ = radio("optConvertFEllipsoids", "Elli&psoids");
   editZones_->setChecked(true);
-  QPushButton* editButton = MakeButton(editFrame, "cmdConvertFEdit", "&Edit...");
+  QPushButton* editButton = MakeButton(editFrame, "cmdConvertFEdit", "Ed&it...");
   auto* editRow = new QHBoxLayout(editFrame);
   editRow->addWidget(editZones_);
   editRow->addWidget(editDatums_);

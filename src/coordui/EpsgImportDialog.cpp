@@ -47,7 +47,8 @@ EpsgImportDialog::EpsgImportDialog(QWidget* parent) : QDialog(parent) {
   connect(ok, &QPushButton::clicked, this, [this] {
     if (chosen()) accept();
   });
-  connect(list_, &QListWidget::itemDoubleClicked, this, [this] {
+  // Enter or a double click on a system takes it.
+  connect(list_, &QListWidget::itemActivated, this, [this] {
     if (chosen()) accept();
   });
   connect(cancel, &QPushButton::clicked, this, &QDialog::reject);
@@ -69,12 +70,17 @@ void EpsgImportDialog::search() {
   if (!found.error.empty()) {
     status_->setText(QString::fromStdString(found.error));
   } else {
-    status_->setText(QString("%1 systems found.").arg(candidates_.size()));
+    status_->setText(candidates_.size() == 1
+                         ? QString("1 system found.")
+                         : QString("%1 systems found.").arg(candidates_.size()));
   }
   auto usable = std::find_if(candidates_.begin(), candidates_.end(),
                              [](const EpsgCandidate& c) { return c.refusal.empty(); });
-  if (usable != candidates_.end())
+  if (usable != candidates_.end()) {
+    // The next Enter takes the system found.
     list_->setCurrentRow(static_cast<int>(usable - candidates_.begin()));
+    list_->setFocus();
+  }
 }
 
 std::optional<EpsgCandidate> EpsgImportDialog::chosen() const {

@@ -97,8 +97,10 @@ TEST(LocalDialogs, LocalToGridPresetsTheRecordedReference) {
   QTest::keyClicks(zones->lineEdit(), "401");
   QTest::keyClick(zones->lineEdit(), Qt::Key_Return);
   EXPECT_EQ(zones->currentText(), "0401 California Zone 1");
+  EXPECT_TRUE(runs.empty());
   QTest::keyClicks(factor, "1.00012");
-  Click(&dialog, "cmdOK");
+  // Enter on the entry as shown answers the dialog.
+  QTest::keyClick(zones->lineEdit(), Qt::Key_Return);
   ASSERT_EQ(runs.size(), 1u);
   EXPECT_EQ(runs[0].datumYear + "|" + runs[0].zoneCode + "|" + runs[0].factor, "1983|0401|1.00012");
   EXPECT_TRUE(ui.boxes.empty());

@@ -113,6 +113,9 @@ void GridToLocalDialog::ok() {
       return;
     case LocalOk::Done:
       accept();
+      // The completion box closed over this dialog just before it: some
+      // window managers then leave no window with the keyboard focus.
+      if (parentWidget()) parentWidget()->activateWindow();
       return;
   }
 }

@@ -3,9 +3,11 @@
 #include <QComboBox>
 #include <QFormLayout>
 #include <QHBoxLayout>
+#include <QKeyEvent>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QVBoxLayout>
+#include <utility>
 
 #include "app/TranslateLogic.h"
 #include "geodesy/ConversionForm.h"
@@ -56,6 +58,7 @@ LocalToGridDialog::LocalToGridDialog(Ui& ui, const std::string& appFolder,
   fields->addRow("&Combined Factor:", factor_);
 
   auto* okButton = MakeButton(this, "cmdOK", "OK");
+  okButton->setDefault(true);
   auto* cancelButton = MakeButton(this, "cmdCancel", "Cancel");
   auto* buttons = new QHBoxLayout;
   buttons->addStretch();
@@ -69,14 +72,28 @@ LocalToGridDialog::LocalToGridDialog(Ui& ui, const std::string& appFolder,
           [this](int index) { form_.datums().selected = index; });
   connect(zones_, &QComboBox::currentIndexChanged, this,
           [this](int index) { form_.zones().selected = index; });
-  connect(datums_->lineEdit(), &QLineEdit::returnPressed, this,
-          [this] { selectTyped(datums_, form_.datums()); });
-  connect(zones_->lineEdit(), &QLineEdit::returnPressed, this,
-          [this] { selectTyped(zones_, form_.zones()); });
+  datums_->lineEdit()->installEventFilter(this);
+  zones_->lineEdit()->installEventFilter(this);
   connect(factor_, &QLineEdit::textChanged, this,
           [this](const QString& text) { form_.factor() = text.toStdString(); });
   connect(okButton, &QPushButton::clicked, this, &LocalToGridDialog::ok);
   connect(cancelButton, &QPushButton::clicked, this, &QDialog::reject);
+}
+
+bool LocalToGridDialog::eventFilter(QObject* watched, QEvent* event) {
+  if (event->type() == QEvent::KeyPress) {
+    const int key = static_cast<QKeyEvent*>(event)->key();
+    if (key == Qt::Key_Return || key == Qt::Key_Enter) {
+      for (auto [box, list] : {std::pair{datums_, &form_.datums()}, {zones_, &form_.zones()}}) {
+        if (watched == box->lineEdit() &&
+            box->currentText() != box->itemText(box->currentIndex())) {
+          selectTyped(box, *list);
+          return true;
+        }
+      }
+    }
+  }
+  return QDialog::eventFilter(watched, event);
 }
 
 void LocalToGridDialog::selectTyped(QComboBox* box, LocalList& list) {
@@ -109,6 +126,9 @@ void LocalToGridDialog::ok() {
       return;
     case LocalOk::Done:
       accept();
+      // The completion box closed over this dialog just before it: some
+      // window managers then leave no window with the keyboard focus.
+      if (parentWidget()) parentWidget()->activateWindow();
       return;
   }
 }

@@ -21,6 +21,11 @@ class LocalToGridDialog : public QDialog {
                     std::string input, std::string output, LocalToGridRunner run,
                     QWidget* parent = nullptr);
 
+ protected:
+  // Enter in a list whose text was typed selects by number; on an entry as
+  // shown it goes on to OK.
+  bool eventFilter(QObject* watched, QEvent* event) override;
+
  private:
   // Enter in a list: the entry whose item data is the number typed.
   void selectTyped(QComboBox* box, LocalList& list);

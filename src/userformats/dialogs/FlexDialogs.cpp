@@ -25,7 +25,7 @@ constexpr const char* kListNames[] = {"CS",     "Zone",   "HDatum", "HUnits",
                                       "VDatum", "VUnits", "LatDir", "LongDir"};
 constexpr const char* kCaptions[] = {
     "Coordinate &System:", "&Zone:",           "&Horizontal Datum:",   "Horizontal &Units:",
-    "&Vertical Datum:",    "V&ertical Units:", "&Latitude Direction:", "L&ongitude Direction:"};
+    "&Vertical Datum:",    "V&ertical Units:", "Latitude Dire&ction:", "L&ongitude Direction:"};
 
 QString Q(const std::string& s) {
   return QString::fromStdString(s);
