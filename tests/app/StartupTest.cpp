@@ -151,9 +151,7 @@ TEST_F(ExecutableTest, TranslatesWithRelativePathsAndAsksOnStandardInput) {
   EXPECT_EQ(r.status, 0) << r.err;
   EXPECT_EQ(r.err, "");
   std::string pac = ReadFile(work.file("job.pac"));
-  EXPECT_EQ(pac.rfind("PR:Main Street Reconstruction", 0), 0u) << pac;
-  EXPECT_NE(pac.find("\r\nAC:PD\r\nPN:CP100\r\nYY:"), std::string::npos);
-  EXPECT_EQ(pac.find("\r\nYC:"), std::string::npos);
+  EXPECT_NE(pac.find("\r\nAC:PD\r\nPN:CP100\r\nYY:"), std::string::npos) << pac;
 
   work.write("job.pac", "keep me\r\n");
   Result no = toPac("samples/sample.ctl", "job.pac");

@@ -10,6 +10,7 @@
 #include "geodesy/Angles.h"
 #include "geodesy/CatalogStore.h"
 #include "geodesy/Catalogs.h"
+#include "geodesy/NgsTestSupport.h"
 #include "platform/Error.h"
 #include "platform/ProfileDocument.h"
 #include "platform/ScriptedUi.h"
@@ -252,14 +253,14 @@ TEST_F(ShippedZones, SavingOneZoneKeepsEveryOtherByte) {
   }
   // The first edit, line by line.
   const auto [start, end] = Span(now(), "State Plane 1983~Arizona East 0201");
-  EXPECT_EQ(
-      now().substr(start, end - start),
-      CrLf({"[State Plane 1983~Arizona East 0201]", "Full Name=Arizona East (edited)",
-            "Horizontal Datum=NAD 83", "Computational Ellipsoid=", "Vertical Datum=NAVD 88",
-            "Projection=Transverse Mercator", "Show In=1", "Show Out=1",
-            "Central Latitude=31.000000000", "Central Longitude=110.100000000", "False Northing=0",
-            "False Easting=700000", "Scale Factor=0.99995", "Positive Latitude Direction=N",
-            "Positive Longitude Direction=W", "Linear Units=International Feet", ""}));
+  EXPECT_EQ(now().substr(start, end - start),
+            test::Ini("[State Plane 1983~Arizona East 0201]|Full Name=Arizona East (edited)|"
+                      "Horizontal Datum=NAD 83|Computational Ellipsoid=|Vertical Datum=NAVD 88|"
+                      "Projection=Transverse Mercator|Show In=1|Show Out=1|"
+                      "Central Latitude=31.000000000|Central Longitude=110.100000000|"
+                      "False Northing=0|False Easting=700000|Scale Factor=0.99995|"
+                      "Positive Latitude Direction=N|Positive Longitude Direction=W|"
+                      "Linear Units=International Feet|"));
   EXPECT_EQ(ResolveZone(ui, dir.path(), cs, "Alabama West 0102").projection, kObliqueMercator);
 }
 
@@ -281,15 +282,15 @@ TEST_F(ShippedZones, ANewZoneIsAppendedAsTheEditorWritesIt) {
   z.longitudeDirection = "W";
   z.linearUnits = kUsSurveyFeet;
   ASSERT_TRUE(store.save(z));
-  EXPECT_EQ(
-      now(),
-      original + CrLf({"", "[Local Grids~East]", "Full Name=East Zone", "Horizontal Datum=NAD 83",
-                       "Computational Ellipsoid=", "Vertical Datum=NAVD 88",
-                       "Projection=Transverse Mercator", "Show In=1", "Show Out=1",
-                       "Central Latitude=36.400000000", "Central Longitude=88.200000000",
-                       "False Northing=0", "False Easting=250000", "Scale Factor=0.99996",
-                       "Positive Latitude Direction=N", "Positive Longitude Direction=W",
-                       "Linear Units=U.S. Survey Feet"}));
+  EXPECT_EQ(now(), original + test::Ini("|[Local Grids~East]|Full Name=East Zone|"
+                                        "Horizontal Datum=NAD 83|Computational Ellipsoid=|"
+                                        "Vertical Datum=NAVD 88|Projection=Transverse Mercator|"
+                                        "Show In=1|Show Out=1|Central Latitude=36.400000000|"
+                                        "Central Longitude=88.200000000|False Northing=0|"
+                                        "False Easting=250000|Scale Factor=0.99996|"
+                                        "Positive Latitude Direction=N|"
+                                        "Positive Longitude Direction=W|"
+                                        "Linear Units=U.S. Survey Feet"));
   EXPECT_EQ(store.coordinateSystems().back(), "Local Grids");
   EXPECT_EQ(store.zones("Local Grids", ZoneSide::Output), V{"East"});
   const ZoneParameters p = ResolveZone(ui, dir.path(), "local grids", "EAST");
@@ -420,29 +421,12 @@ TEST_F(ShippedZones, AKilledSaveLeavesTheOldOrTheNewFile) {
 
 TEST(DatumStoreTest, TransformationsAreTheKeysNamedAfterOtherDatums) {
   TempDir dir;
-  const std::string path = dir.write("datums.ini", CrLf({"[NAD 27]",
-                                                         "Full Name=NAD 1927",
-                                                         "Type=Horizontal",
-                                                         "Ellipsoid=Clarke 1866",
-                                                         "Show In=1",
-                                                         "Show Out=1",
-                                                         "nad 83=NADCON NAD 27 to NAD 83",
-                                                         "Old Key=kept",
-                                                         "NGVD 29=",
-                                                         "NAD 27=self",
-                                                         "",
-                                                         "[NAD 83]",
-                                                         "Type=Horizontal",
-                                                         "",
-                                                         "[NGVD 29]",
-                                                         "Type=Vertical",
-                                                         "Ellipsoid=stale",
-                                                         "Show In=1",
-                                                         "Show Out=0",
-                                                         "NAVD 88=VERTCON NGVD 29 to NAVD 88",
-                                                         "",
-                                                         "[NAVD 88]",
-                                                         "Type=Vertical"}));
+  const std::string path = dir.write(
+      "datums.ini",
+      test::Ini("[NAD 27]|Full Name=NAD 1927|Type=Horizontal|Ellipsoid=Clarke 1866|Show In=1|"
+                "Show Out=1|nad 83=NADCON NAD 27 to NAD 83|Old Key=kept|NGVD 29=|NAD 27=self||"
+                "[NAD 83]|Type=Horizontal||[NGVD 29]|Type=Vertical|Ellipsoid=stale|Show In=1|"
+                "Show Out=0|NAVD 88=VERTCON NGVD 29 to NAVD 88||[NAVD 88]|Type=Vertical"));
   const DatumStore store(path);
   DatumRecord nad27 = *store.load("nad 27");
   EXPECT_EQ(nad27.name, "NAD 27");  // as the file spells it
@@ -509,7 +493,6 @@ TEST(EllipsoidStoreTest, NewEllipsoidWithPlainNumbers) {
   EXPECT_EQ(store.load("tiny"), e);
   EXPECT_FALSE(store.save(EllipsoidRecord{}));
   EXPECT_EQ(store.load("Other"), std::nullopt);
-  EXPECT_EQ(store.load("Tiny")->name, "Tiny");
 }
 
 // The flex store saves a format with the same one write.

@@ -1,6 +1,7 @@
 // The coordinate conversion dialogs over their logic (tested on its own):
-// controls and focus, Edit Parameters, the manual entry, a typed point all
-// the way to its results window, and the printout.
+// controls and focus, Edit Parameters, the manual entry, dialogs asked for by
+// a worker, and the printout. The whole flow from the window is driven by
+// tests/scenarios/coordinate-conversion.sh.
 
 #include <gtest/gtest.h>
 
@@ -23,7 +24,6 @@
 #include <memory>
 #include <sstream>
 
-#include "app/AppContext.h"
 #include "app/dialogs/QtEngineDialogs.h"
 #include "coordui/CoordinateConversionDialog.h"
 #include "coordui/CoordinateResultsDialog.h"
@@ -90,16 +90,8 @@ class CoordDialogsTest : public ::testing::Test {
     for (const char* name : {"zones.ini", "datums.ini", "ellipsoids.ini"}) {
       std::filesystem::copy_file(std::string(ZV_APP_DIR) + "/" + name, app.file(name));
     }
-    // Geographic NAD 83 into an Alabama zone: no NGS program runs.
-    for (const char* kv :
-         {"Input Coordinate System=Geographic Coordinates", "Input Horizontal Datum=NAD 83",
-          "Input Horizontal Units=DDD MM SS.ssss", "Input Vertical Datum=NAVD 88",
-          "Input Vertical Units=Meters", "Output Coordinate System=State Plane 1983",
-          "Output Zone=Alabama East 0101", "Convergence Angle=1"}) {
-      const std::string text = kv;
-      store.save(kConversionSection, text.substr(0, text.find('=')),
-                 text.substr(text.find('=') + 1));
-    }
+    store.save(kConversionSection, "Output Coordinate System", "State Plane 1983");
+    store.save(kConversionSection, "Output Zone", "Alabama East 0101");
   }
 
   // Types "name=text|..." into the line edits of `w`.
@@ -121,15 +113,6 @@ TEST_F(CoordDialogsTest, ConversionDialogBindsTheFormAndFocusesTheRefusedList) {
   MemorySettings empty;
   CoordinateConversionDialog d(ui, app.path(), state, empty, ConversionDialogs{});
   d.load();
-  for (const char* side : {"In", "Out"}) {
-    for (const char* list : {"CS", "Zone", "HDatum", "HUnits", "VDatum", "VUnits"})
-      Child<QComboBox>(&d, (std::string("cmbConvertF") + list + side).c_str());
-  }
-  for (const char* name :
-       {"chkConvertFScaleFactor", "chkConvertFConvAngle", "chkConvertFLatLong", "chkConvertFGeoid",
-        "cmdConvertFOK", "cmdConvertFCancel", "cmdConvertFEdit", "optConvertFZones",
-        "optConvertFDatums", "optConvertFEllipsoids"})
-    Child<QAbstractButton>(&d, name);
   auto* geoid = Child<QCheckBox>(&d, "chkConvertFGeoid");
   EXPECT_EQ(Items(Child<QComboBox>(&d, "cmbConvertFCSIn")).last(), "Geographic Coordinates");
   EXPECT_FALSE(geoid->isEnabled() || Child<QComboBox>(&d, "cmbConvertFGeoid")->isEnabled());
@@ -188,22 +171,6 @@ TEST_F(CoordDialogsTest, EditParametersAsksFirstAndNamesTheMissingEditor) {
   EXPECT_EQ(Child<QComboBox>(&d, "cmbConvertFZoneOut")->currentText(), "Alabama East 0101");
 }
 
-TEST_F(CoordDialogsTest, AFileRunClosesTheDialogOnceConvertedAndRemembersTheChoice) {
-  state.points.resize(2);
-  state.points[0].Latitude = 0.57;
-  state.points[0].Longitude = 1.50;
-  CoordinateConversionDialog d(ui, app.path(), state, store, ConversionDialogs{});
-  d.load();
-  Click(&d, "chkConvertFScaleFactor");
-  Click(&d, "cmdConvertFOK");
-  EXPECT_EQ(Boxes(ui), "");
-  EXPECT_EQ(d.result(), QDialog::Accepted);
-  EXPECT_TRUE(state.accepted);
-  EXPECT_NE(state.points[0].Northing, kNoValue);
-  EXPECT_EQ(state.points[1].Northing, kNoValue);  // no position, nothing projected
-  EXPECT_EQ(store.get(kConversionSection, "Scale Factor", ""), "1");
-}
-
 TEST_F(CoordDialogsTest, ManualEntryChecksEachFieldAndPutsTheFocusBack) {
   const ManualEntrySetup geo{true, true, "Meters", "Ellipsoid", "DDD MM SS.ssss", ""};
   const ManualEntrySetup plane{false, true, "Meters", "Orthometric", "", "Meters"};
@@ -246,34 +213,6 @@ TEST_F(CoordDialogsTest, ManualEntryChecksEachFieldAndPutsTheFocusBack) {
       EXPECT_EQ(d.focusWidget(), Child<QWidget>(&d, c.focus));
     }
   }
-}
-
-// SinglePoint through the engine's dialogs, as a user answers them.
-TEST_F(CoordDialogsTest, ATypedPointEndsInTheResultsWindowWithTheDriversReport) {
-  AppContext ctx(ui, app.path());
-  ctx.settings = &store;
-  QtEngineDialogs dialogs(ui);
-  state.singlePoint = true;
-  state.points.assign(1, SurveyPoint{});
-  OnModal("frmCoordinateConversion", [](QWidget* w) { Click(w, "cmdConvertFOK"); });
-  OnModal("frmManualCoordEntry", [](QWidget* w) {
-    Type(w,
-         "txtManualGeoName=P1|txtManualLatitude=32 30 00|txtManualLongitude=86 00 00|"
-         "txtManualGeoHeight=100");
-    Click(w, "cmdManualOK");
-  });
-  QString shown;
-  OnModal("frmCoordinateResults", [&shown](QWidget* w) {
-    shown = Child<QPlainTextEdit>(w, "txtCoordResults")->toPlainText();
-    Click(w, "cmdCoordResultsOK");
-  });
-  EXPECT_TRUE(dialogs.coordinateConversion(ctx, state, /*presetInput=*/false));
-  EXPECT_EQ(Boxes(ui), "");
-  EXPECT_NE(state.report.find("Point Name: P1"), std::string::npos);
-  EXPECT_NE(state.report.find("Convergence Angle: "), std::string::npos);
-  EXPECT_EQ(shown.toStdString(),
-            QString::fromStdString(state.report).replace("\r\n", "\n").toStdString());
-  EXPECT_EQ(store.get(kConversionSection, "Input Vertical Datum", ""), "NAVD 88");
 }
 
 // A routine that runs on a worker thread gets its dialogs from the GUI thread.
