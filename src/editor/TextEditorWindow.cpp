@@ -454,11 +454,12 @@ bool TextEditorWindow::showRecordView() {
   const QString record = QString::fromStdString(stem + ".rec");
   if (!writeText(list)) return false;
   std::string error;
-  const bool ok = convert([&] { return ConvertListToRecord(Std(list), Std(record), error); });
+  const bool ok = convert(
+      [&] { return ConvertListToRecord(Std(list), Std(record), error, CurrentRunProgress()); });
   std::error_code ec;
   std::filesystem::remove(Std(list), ec);
   if (!ok) {
-    ui_.exclaim(Std(WriteError(record, error)));
+    if (!error.empty()) ui_.exclaim(Std(WriteError(record, error)));
     return false;
   }
   path_ = record;
@@ -475,11 +476,12 @@ bool TextEditorWindow::showListView() {
   const QString list = QString::fromStdString(stem + ".lst");
   if (!writeText(record)) return false;
   std::string error;
-  const bool ok = convert([&] { return ConvertRecordToList(Std(record), Std(list), error); });
+  const bool ok = convert(
+      [&] { return ConvertRecordToList(Std(record), Std(list), error, CurrentRunProgress()); });
   std::error_code ec;
   std::filesystem::remove(Std(record), ec);
   if (!ok) {
-    ui_.exclaim(Std(WriteError(list, error)));
+    if (!error.empty()) ui_.exclaim(Std(WriteError(list, error)));
     return false;
   }
   path_ = list;
@@ -488,8 +490,14 @@ bool TextEditorWindow::showListView() {
   return true;
 }
 
+// False without an error when the user stopped it.
 bool TextEditorWindow::convert(const std::function<bool()>& work) {
-  return large_ ? RunInBackground(this, "Converting...", work) : work();
+  if (!large_) return work();
+  try {
+    return RunInBackground(this, "Converting...", work);
+  } catch (const RunCancelled&) {
+    return false;
+  }
 }
 
 void TextEditorWindow::updateStatus() {

@@ -133,10 +133,11 @@ bool LineReader::next(std::string_view& line) {
   }
 }
 
-bool ReadTextLines(const std::string& path, std::vector<std::string>& lines) {
+bool ReadTextLines(const std::string& path, std::vector<std::string>& lines,
+                   RunProgress* progress) {
   std::ifstream in(path, std::ios::binary);
   if (!in) return false;
-  LineReader reader(in);
+  LineReader reader(in, progress);
   std::string_view line;
   while (reader.next(line)) lines.emplace_back(line);
   return true;

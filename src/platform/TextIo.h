@@ -68,7 +68,8 @@ class LineReader {
 };
 
 // Reads a whole text file into lines; false when it cannot be opened.
-bool ReadTextLines(const std::string& path, std::vector<std::string>& lines);
+bool ReadTextLines(const std::string& path, std::vector<std::string>& lines,
+                   RunProgress* progress = nullptr);
 
 class TextFileWriter {
  public:

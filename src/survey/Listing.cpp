@@ -204,9 +204,9 @@ std::vector<std::string> RecordToList(const std::vector<std::string>& recordLine
 }
 
 bool ConvertListToRecord(const std::string& listPath, const std::string& recordPath,
-                         std::string& error) {
+                         std::string& error, RunProgress* progress) {
   std::vector<std::string> lines;
-  if (!ReadTextLines(listPath, lines)) {
+  if (!ReadTextLines(listPath, lines, progress)) {
     error = "The file '" + listPath + "' could not be read.";
     return false;
   }
@@ -214,9 +214,9 @@ bool ConvertListToRecord(const std::string& listPath, const std::string& recordP
 }
 
 bool ConvertRecordToList(const std::string& recordPath, const std::string& listPath,
-                         std::string& error) {
+                         std::string& error, RunProgress* progress) {
   std::vector<std::string> lines;
-  if (!ReadTextLines(recordPath, lines)) {
+  if (!ReadTextLines(recordPath, lines, progress)) {
     error = "The file '" + recordPath + "' could not be read.";
     return false;
   }

@@ -7,17 +7,20 @@
 #include <string>
 #include <vector>
 
+#include "platform/Progress.h"
+
 namespace zv {
 
 std::vector<std::string> ListToRecord(const std::vector<std::string>& listLines);
 std::vector<std::string> RecordToList(const std::vector<std::string>& recordLines);
 
 // File forms: read one file and write the other (temporary file and rename).
-// False with `error` set when a file cannot be read or written.
+// False with `error` set when a file cannot be read or written. Reading
+// reports to `progress`, which may stop it (RunCancelled; nothing written).
 bool ConvertListToRecord(const std::string& listPath, const std::string& recordPath,
-                         std::string& error);
+                         std::string& error, RunProgress* progress = nullptr);
 bool ConvertRecordToList(const std::string& recordPath, const std::string& listPath,
-                         std::string& error);
+                         std::string& error, RunProgress* progress = nullptr);
 
 // The stem N of an editor file (its name without a trailing ".lst"); the
 // list file is N + ".lst" and the record file N + ".rec".

@@ -388,6 +388,13 @@ TEST(SurveyListing, FileForms) {
   EXPECT_EQ(test::ReadFile(dir.file("c.lst")), test::ReadFile(Fixture("listing/control.lst")));
   EXPECT_FALSE(ConvertListToRecord(dir.file("none.lst"), dir.file("x.rec"), error));
   EXPECT_NE(error.find("none.lst"), std::string::npos);
+  // A stop while reading leaves the other file as it was.
+  struct Stop : RunProgress {
+    void step(RunStage, std::uintmax_t, std::uintmax_t) override { throw RunCancelled{}; }
+  } stop;
+  EXPECT_THROW(ConvertRecordToList(dir.file("c.rec"), dir.file("c.lst"), error, &stop),
+               RunCancelled);
+  EXPECT_EQ(test::ReadFile(dir.file("c.lst")), test::ReadFile(Fixture("listing/control.lst")));
   EXPECT_EQ(ListingStem("/a/b.CTL.lst"), "/a/b.CTL");
   EXPECT_EQ(ListingStem("/a/b.CTL"), "/a/b.CTL");
 }
