@@ -10,6 +10,7 @@
 #include <QVBoxLayout>
 
 #include "geodesy/Angles.h"
+#include "platform/qt/Controls.h"
 
 namespace zv {
 
@@ -93,12 +94,9 @@ ManualEntryDialog::ManualEntryDialog(Ui& ui, ManualEntrySetup setup, SurveyPoint
   height_ = setup_.geographic ? geoHeight : planeHeight;
   height_->setEnabled(setup_.heightWanted);
 
-  auto* okButton = new QPushButton("OK", this);
-  okButton->setObjectName("cmdManualOK");
+  QPushButton* okButton = MakeButton(this, "cmdManualOK", "OK");
   okButton->setDefault(true);
-  auto* cancelButton = new QPushButton("Cancel", this);
-  cancelButton->setObjectName("cmdManualCancel");
-  cancelButton->setAutoDefault(false);
+  QPushButton* cancelButton = MakeButton(this, "cmdManualCancel", "Cancel");
   auto* buttons = new QHBoxLayout;
   buttons->addStretch();
   buttons->addWidget(okButton);

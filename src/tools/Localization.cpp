@@ -31,6 +31,21 @@ void ForEachHeaderLine(std::istream& in, F f) {
   }
 }
 
+// Runs a tool job under the busy pointer; the completion message only when
+// the tool did its job.
+template <typename Request, typename Run>
+LocalOk RunJob(Ui& ui, Request r, int consoleLeft, int consoleTop, const Run& run,
+               const char* completion) {
+  r.consoleLeft = consoleLeft;
+  r.consoleTop = consoleTop;
+  ui.setBusy(true);
+  const bool done = run(r);
+  ui.setBusy(false);
+  if (!done) return LocalOk::Failed;
+  ui.inform(completion);
+  return LocalOk::Done;
+}
+
 }  // namespace
 
 HeaderScan ScanHeader(std::istream& in) {
@@ -121,15 +136,7 @@ LocalOk GridToLocalForm::ok(Ui& ui, const std::string& input, const std::string&
     refused = Control::PointNumber;
     return LocalOk::Refused;
   }
-  GridToLocalRequest r = request(input, output);
-  r.consoleLeft = consoleLeft;
-  r.consoleTop = consoleTop;
-  ui.setBusy(true);
-  const bool done = run(r);
-  ui.setBusy(false);
-  if (!done) return LocalOk::Failed;
-  ui.inform("Translation Complete");
-  return LocalOk::Done;
+  return RunJob(ui, request(input, output), consoleLeft, consoleTop, run, "Translation Complete");
 }
 
 bool LocalList::selectNumber(const std::string& text) {
@@ -185,15 +192,7 @@ LocalOk LocalToGridForm::ok(Ui& ui, const std::string& input, const std::string&
     return refuse("You specified an invalid value for the combined factor.",
                   Control::CombinedFactor);
   }
-  LocalToGridRequest r = request(input, output);
-  r.consoleLeft = consoleLeft;
-  r.consoleTop = consoleTop;
-  ui.setBusy(true);
-  const bool done = run(r);
-  ui.setBusy(false);
-  if (!done) return LocalOk::Failed;
-  ui.inform("Translation Complete.");
-  return LocalOk::Done;
+  return RunJob(ui, request(input, output), consoleLeft, consoleTop, run, "Translation Complete.");
 }
 
 }  // namespace zv

@@ -15,6 +15,7 @@ struct Reference {
   std::string name;
   std::string values[8];
   std::string& operator[](FlexList l) { return values[static_cast<int>(l)]; }
+  const std::string& operator[](FlexList l) const { return values[static_cast<int>(l)]; }
 };
 
 std::string JoinedOr(const std::vector<std::string>& items) {
@@ -123,6 +124,20 @@ std::optional<Reference> Resolve(Ui& ui, FlexDirection direction, const std::str
   return r;
 }
 
+// The reference as the reader's or writer's choices.
+template <typename Choices>
+void FillChoices(const Reference& r, Choices& c) {
+  c.formatName = r.name;
+  c.coordinateSystem = r[FlexList::CoordinateSystem];
+  c.zone = r[FlexList::Zone];
+  c.horizontalDatum = r[FlexList::HorizontalDatum];
+  c.horizontalUnits = r[FlexList::HorizontalUnits];
+  c.verticalDatum = r[FlexList::VerticalDatum];
+  c.verticalUnits = r[FlexList::VerticalUnits];
+  c.latitudeDirection = r[FlexList::LatitudeDirection];
+  c.longitudeDirection = r[FlexList::LongitudeDirection];
+}
+
 }  // namespace
 
 std::optional<FlexInChoices> UnattendedFlexInChoices(Ui& ui, const std::string& appFolder,
@@ -132,15 +147,7 @@ std::optional<FlexInChoices> UnattendedFlexInChoices(Ui& ui, const std::string& 
       Resolve(ui, FlexDirection::In, appFolder, remembered, formatName, nullptr);
   if (!r) return std::nullopt;
   FlexInChoices c;
-  c.formatName = r->name;
-  c.coordinateSystem = (*r)[FlexList::CoordinateSystem];
-  c.zone = (*r)[FlexList::Zone];
-  c.horizontalDatum = (*r)[FlexList::HorizontalDatum];
-  c.horizontalUnits = (*r)[FlexList::HorizontalUnits];
-  c.verticalDatum = (*r)[FlexList::VerticalDatum];
-  c.verticalUnits = (*r)[FlexList::VerticalUnits];
-  c.latitudeDirection = (*r)[FlexList::LatitudeDirection];
-  c.longitudeDirection = (*r)[FlexList::LongitudeDirection];
+  FillChoices(*r, c);
   return c;
 }
 
@@ -152,15 +159,7 @@ std::optional<FlexOutChoices> UnattendedFlexOutChoices(Ui& ui, const std::string
       Resolve(ui, FlexDirection::Out, appFolder, remembered, formatName, file);
   if (!r) return std::nullopt;
   FlexOutChoices c;
-  c.formatName = r->name;
-  c.coordinateSystem = (*r)[FlexList::CoordinateSystem];
-  c.zone = (*r)[FlexList::Zone];
-  c.horizontalDatum = (*r)[FlexList::HorizontalDatum];
-  c.horizontalUnits = (*r)[FlexList::HorizontalUnits];
-  c.verticalDatum = (*r)[FlexList::VerticalDatum];
-  c.verticalUnits = (*r)[FlexList::VerticalUnits];
-  c.latitudeDirection = (*r)[FlexList::LatitudeDirection];
-  c.longitudeDirection = (*r)[FlexList::LongitudeDirection];
+  FillChoices(*r, c);
   return c;
 }
 

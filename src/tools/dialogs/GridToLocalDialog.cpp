@@ -8,7 +8,8 @@
 #include <QRadioButton>
 #include <QVBoxLayout>
 
-#include "app/TranslateLogic.h"
+#include "platform/qt/Controls.h"
+#include "tools/dialogs/ToolDialog.h"
 
 namespace zv {
 
@@ -53,12 +54,9 @@ GridToLocalDialog::GridToLocalDialog(Ui& ui, std::string input, std::string outp
   grid->addWidget(pointNumber_, 2, 0);
   grid->addWidget(pointBox_, 2, 1);
 
-  auto* okButton = new QPushButton("OK", this);
-  okButton->setObjectName("cmdOK");
+  QPushButton* okButton = MakeButton(this, "cmdOK", "OK");
   okButton->setDefault(true);
-  auto* cancelButton = new QPushButton("Cancel", this);
-  cancelButton->setObjectName("cmdCancel");
-  cancelButton->setAutoDefault(false);
+  QPushButton* cancelButton = MakeButton(this, "cmdCancel", "Cancel");
   auto* buttons = new QHBoxLayout;
   buttons->addStretch();
   buttons->addWidget(okButton);
@@ -99,8 +97,7 @@ void GridToLocalDialog::choose(GridToLocalForm::Option option) {
 }
 
 void GridToLocalDialog::ok() {
-  const QRect f = frameGeometry();
-  const ConsolePlace console = ConsoleBelow({f.x(), f.y(), f.width(), f.height()});
+  const ConsolePlace console = ConsoleBelowDialog(*this);
   GridToLocalForm::Control refused = GridToLocalForm::Control::UserDefined;
   switch (form_.ok(ui_, input_, output_, console.left, console.top, run_, refused)) {
     case LocalOk::Refused: {
@@ -112,10 +109,7 @@ void GridToLocalDialog::ok() {
     case LocalOk::Failed:
       return;
     case LocalOk::Done:
-      accept();
-      // The completion box closed over this dialog just before it: some
-      // window managers then leave no window with the keyboard focus.
-      if (parentWidget()) parentWidget()->activateWindow();
+      CloseAfterRun(*this);
       return;
   }
 }

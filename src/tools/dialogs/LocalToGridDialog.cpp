@@ -9,10 +9,10 @@
 #include <QVBoxLayout>
 #include <utility>
 
-#include "app/TranslateLogic.h"
 #include "geodesy/ConversionForm.h"
 #include "platform/Error.h"
 #include "platform/qt/Controls.h"
+#include "tools/dialogs/ToolDialog.h"
 
 namespace zv {
 
@@ -104,8 +104,7 @@ void LocalToGridDialog::selectTyped(QComboBox* box, LocalList& list) {
 }
 
 void LocalToGridDialog::ok() {
-  const QRect f = frameGeometry();
-  const ConsolePlace console = ConsoleBelow({f.x(), f.y(), f.width(), f.height()});
+  const ConsolePlace console = ConsoleBelowDialog(*this);
   LocalToGridForm::Control refused = LocalToGridForm::Control::HorizontalDatum;
   switch (form_.ok(ui_, input_, output_, console.left, console.top, run_, refused)) {
     case LocalOk::Refused:
@@ -125,10 +124,7 @@ void LocalToGridDialog::ok() {
     case LocalOk::Failed:
       return;
     case LocalOk::Done:
-      accept();
-      // The completion box closed over this dialog just before it: some
-      // window managers then leave no window with the keyboard focus.
-      if (parentWidget()) parentWidget()->activateWindow();
+      CloseAfterRun(*this);
       return;
   }
 }
